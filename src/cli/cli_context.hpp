@@ -1,0 +1,32 @@
+// What every subcommand of tarn-cli shares: the folder of the results and checkpoint files,
+// the stop request raised by Ctrl-C or SIGTERM, and the exit code the command leaves.
+#pragma once
+
+#include <string>
+
+#include "core/stop_signal.hpp"
+
+namespace CLI {
+class App;
+}
+
+namespace tarn::cli {
+
+// Exit codes common to the subcommands.
+enum ExitCode : int { kOk = 0, kIoFailure = 1, kRefused = 2, kStopped = 3 };
+
+struct Context {
+    std::string folder;  // with one trailing separator once parsed
+    StopSignal& stop;
+    int exitCode = kOk;
+};
+
+// Each subcommand family registers itself here; the callbacks set ctx.exitCode.
+void registerNumberCommands(CLI::App& app, Context& ctx);
+void registerGenerationCommands(CLI::App& app, Context& ctx);
+void registerSplitCommand(CLI::App& app, Context& ctx);
+
+// Raises `stop` on SIGINT and SIGTERM.
+void installInterruptHandler(StopSignal& stop);
+
+}  // namespace tarn::cli

@@ -1,0 +1,9 @@
+#include <CLI/CLI.hpp>
+
+#include "cli/cli_context.hpp"
+
+namespace tarn::cli {
+
+void registerGenerationCommands(CLI::App&, Context&) {}
+
+}  // namespace tarn::cli

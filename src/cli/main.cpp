@@ -1,0 +1,38 @@
+// tarn-cli: the command-line front end over the same engine as the desktop program.
+#include <CLI/CLI.hpp>
+
+#include "cli/cli_context.hpp"
+#include "core/app_folder.hpp"
+
+int main(int argc, char** argv) {
+    tarn::StopSignal stop;
+    tarn::cli::Context ctx{tarn::AppFolder(), stop};
+
+    CLI::App app{"Tarn: generate, test, factorize and split prime numbers.", "tarn-cli"};
+    app.set_version_flag("--version", std::string("tarn-cli ") + TARN_VERSION);
+    app.require_subcommand(0, 1);
+    std::string folder;
+    app.add_option("--folder", folder,
+                   "Folder of primes.txt and primes.ini (default: the program's folder)")
+        ->check(CLI::ExistingDirectory);
+    app.parse_complete_callback([&] {
+        if (!folder.empty()) ctx.folder = tarn::withTrailingSeparator(folder);
+    });
+
+    tarn::cli::registerNumberCommands(app, ctx);
+    tarn::cli::registerGenerationCommands(app, ctx);
+    tarn::cli::registerSplitCommand(app, ctx);
+
+    tarn::cli::installInterruptHandler(stop);
+    try {
+        app.parse(argc, argv);
+    } catch (const CLI::ParseError& e) {
+        const int code = app.exit(e);
+        return code == 0 ? 0 : tarn::cli::kRefused;
+    }
+    if (argc == 1) {
+        std::cout << app.help();
+        return 0;
+    }
+    return ctx.exitCode;
+}
