@@ -1,0 +1,89 @@
+#include "generation/checkpoint_file.hpp"
+
+#include <fcntl.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <climits>
+#include <cstring>
+#include <fstream>
+#include <iterator>
+
+namespace tarn {
+namespace {
+
+// One number as the reader takes it: blanks and line ends before it are skipped; it ends at a
+// blank, a comma or the end of a line.
+std::optional<std::int64_t> nextNumber(const std::string& text, std::size_t& pos,
+                                       std::int64_t low, std::int64_t high) {
+    while (pos < text.size() && (text[pos] == ' ' || text[pos] == '\t' || text[pos] == '\r' ||
+                                 text[pos] == '\n'))
+        ++pos;
+    bool negative = false;
+    if (pos < text.size() && (text[pos] == '-' || text[pos] == '+')) negative = text[pos++] == '-';
+    std::size_t digits = 0;
+    __int128 value = 0;
+    while (pos < text.size() && text[pos] >= '0' && text[pos] <= '9') {
+        value = value * 10 + (text[pos++] - '0');
+        if (value > static_cast<__int128>(INT64_MAX) + 1) return std::nullopt;
+        ++digits;
+    }
+    if (digits == 0) return std::nullopt;
+    if (pos < text.size() && !(text[pos] == ' ' || text[pos] == ',' || text[pos] == '\r' ||
+                               text[pos] == '\n' || text[pos] == '\t'))
+        return std::nullopt;
+    if (pos < text.size() && text[pos] == ',') ++pos;
+    if (negative) value = -value;
+    if (value < low || value > high) return std::nullopt;
+    return static_cast<std::int64_t>(value);
+}
+
+std::string systemReason(int error) { return std::strerror(error); }
+
+}  // namespace
+
+std::string checkpointLine(const Checkpoint& c) {
+    std::string line;
+    for (const std::int64_t v : {c.candidate, c.limit, static_cast<std::int64_t>(c.interrupted)}) {
+        if (v >= 0) line += ' ';  // the blank stands where a minus sign would
+        line += std::to_string(v);
+        line += ' ';
+    }
+    line += "\r\n";
+    return line;
+}
+
+std::optional<Checkpoint> readCheckpoint(const std::string& path) {
+    std::ifstream in(path, std::ios::binary);
+    if (!in) return std::nullopt;
+    const std::string text{std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+    // Candidate and Limit are whole Numbers; Interrupted is a 16-bit integer.
+    constexpr std::int64_t kMaxWhole = INT64_MAX / 10000;
+    std::size_t pos = 0;
+    const auto candidate = nextNumber(text, pos, -kMaxWhole - 1, kMaxWhole);
+    if (!candidate) return std::nullopt;
+    const auto limit = nextNumber(text, pos, -kMaxWhole - 1, kMaxWhole);
+    if (!limit) return std::nullopt;
+    const auto interrupted = nextNumber(text, pos, SHRT_MIN, SHRT_MAX);
+    if (!interrupted) return std::nullopt;
+    return Checkpoint{*candidate, *limit, static_cast<int>(*interrupted)};
+}
+
+std::string writeCheckpoint(const std::string& path, const Checkpoint& checkpoint) {
+    const std::string temporary = path + ".tmp";
+    const std::string line = checkpointLine(checkpoint);
+    const int fd = ::open(temporary.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
+    if (fd < 0) return systemReason(errno);
+    const ssize_t written = ::write(fd, line.data(), line.size());
+    int error = written == static_cast<ssize_t>(line.size()) ? 0 : (written < 0 ? errno : ENOSPC);
+    if (error == 0 && ::fdatasync(fd) != 0) error = errno;
+    if (::close(fd) != 0 && error == 0) error = errno;
+    if (error == 0 && ::rename(temporary.c_str(), path.c_str()) != 0) error = errno;
+    if (error != 0) {
+        ::unlink(temporary.c_str());
+        return systemReason(error);
+    }
+    return {};
+}
+
+}  // namespace tarn
