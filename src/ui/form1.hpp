@@ -1,0 +1,107 @@
+// The main window: the generation panel, the test/factorize panel, the stop button, the web
+// link and the menus. Every long command runs on a worker thread; the window only starts it,
+// shows its progress a few times a second, and reports its outcome when the worker is done.
+#pragma once
+
+#include <QMainWindow>
+#include <QPointer>
+#include <QTimer>
+#include <chrono>
+#include <cstdint>
+#include <memory>
+#include <string>
+
+#include "core/stop_signal.hpp"
+#include "generation/generation_job.hpp"
+
+namespace Ui {
+class Form1;
+}
+
+namespace tarn::ui {
+
+class MessageBox;
+class Shell;
+
+inline constexpr const char* kMakerWebAddress = "https://brindle.example";
+
+class Form1 : public QMainWindow {
+    Q_OBJECT
+
+public:
+    // `folder` holds primes.txt, primes.ini and README.txt (one trailing separator).
+    Form1(MessageBox& messages, Shell& shell, std::string folder, QWidget* parent = nullptr);
+    ~Form1() override;
+
+    // Start-up: the checkpoint is made sure of and the user told about a stopped job.
+    // Runs before the window is first shown.
+    void Form_Load();
+
+    Ui::Form1& controls() { return *ui_; }
+    const std::string& folder() const { return folder_; }
+    bool jobRunning() const { return jobRunning_; }
+    bool numberCommandRunning() const { return numberRunning_; }
+    QWidget* splitWindow() const { return splitWindow_; }
+
+public Q_SLOTS:
+    void Command1_Click();  // Generate
+    void Command2_Click();  // Test
+    void Command3_Click();  // Resume
+    void Command4_Click();  // web link
+    void Command5_Click();  // Cancel all calculations
+    void Command6_Click();  // Factorize
+    void show_Click();
+    void spllit_Click();
+    void exit_Click();
+    void readme_Click();
+
+Q_SIGNALS:
+    // Emitted once a worker's outcome has been shown.
+    void numberCommandFinished();
+    void jobFinished();
+
+protected:
+    void closeEvent(QCloseEvent* event) override;
+
+private:
+    enum class OpenMode { OnRequest, AfterJob };
+    void OpenResultsFile(OpenMode mode, const std::string& path);
+    void reportLaunch(const std::string& failure);
+    char decimalSeparator() const;
+
+    // Test and Factorize.
+    void finishTest(std::int64_t number, int code);
+    void finishFactorize(std::int64_t number, const std::string& line, bool stopped);
+
+    // Generation and resume jobs.
+    void startJobDisplay(std::int64_t limit, std::int64_t position);
+    void refreshJobDisplay();
+    void finishJob(const JobResult& result);
+    bool refuseWhileJobRuns();
+    void requestClose();
+
+    std::unique_ptr<Ui::Form1> ui_;
+    MessageBox& messages_;
+    Shell& shell_;
+    std::string folder_;
+    QPointer<QWidget> splitWindow_;
+
+    // Test/Factorize and the jobs have stop requests of their own, so that a test started
+    // while a job runs cannot swallow the job's pending stop; "Cancel all calculations"
+    // and closing the window raise both.
+    StopSignal numberStop_;
+    StopSignal jobStop_;
+    bool closingRequested_ = false;
+    bool numberRunning_ = false;
+    bool jobRunning_ = false;
+
+    JobProgress jobProgress_;
+    std::int64_t jobLimit_ = 0;
+    std::chrono::steady_clock::time_point jobStart_;
+    QTimer progressTimer_;
+};
+
+// "Elapsed Time: 1:01:45": true elapsed time, hours without a bound.
+std::string elapsedTimeText(std::chrono::seconds elapsed);
+
+}  // namespace tarn::ui
