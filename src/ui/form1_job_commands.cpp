@@ -5,8 +5,6 @@ namespace tarn::ui {
 void Form1::Form_Load() {}
 void Form1::Command1_Click() {}
 void Form1::Command3_Click() {}
-void Form1::show_Click() {}
-void Form1::OpenResultsFile(OpenMode, const std::string&) {}
 void Form1::startJobDisplay(std::int64_t, std::int64_t) {}
 void Form1::refreshJobDisplay() {}
 void Form1::finishJob(const JobResult&) {}
