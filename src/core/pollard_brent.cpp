@@ -1,5 +1,6 @@
 #include "core/pollard_brent.hpp"
 
+#include <array>
 #include <bit>
 
 #include "core/montgomery.hpp"
@@ -20,50 +21,91 @@ std::uint64_t binaryGcd(std::uint64_t a, std::uint64_t b) {
     return a << shift;
 }
 
+// Montgomery products without the final correction. For n below 2^58 and factors below 8n,
+// (a*b + m*n) / 2^64 stays below 2n, so the walk x -> x^2 + c (c < 2n) never leaves [0, 4n)
+// and needs no compare at all; residues are only congruent, which is all a gcd needs.
+class LazyMontgomery {
+public:
+    explicit LazyMontgomery(std::uint64_t n) : n_(n) {
+        std::uint64_t inv = n;
+        for (int i = 0; i < 5; ++i) inv *= 2 - n * inv;
+        negInv_ = 0 - inv;
+    }
+    std::uint64_t mul(std::uint64_t a, std::uint64_t b) const {
+        const u128 t = static_cast<u128>(a) * b;
+        const auto tl = static_cast<std::uint64_t>(t);
+        const std::uint64_t m = tl * negInv_;
+        const u128 mn = static_cast<u128>(m) * n_;
+        // tl + low(m*n) is 0 mod 2^64, with a carry exactly when tl is not 0.
+        return static_cast<std::uint64_t>(t >> 64) + static_cast<std::uint64_t>(mn >> 64) +
+               (tl != 0);
+    }
+
+private:
+    std::uint64_t n_;
+    std::uint64_t negInv_;
+};
+
 constexpr int kBatch = 128;
+// Walks that run side by side: each step of one walk waits on the last, so a few independent
+// walks fill the multiplier, and the first of them to find a factor ends the search sooner.
+constexpr int kWalks = 2;
 
-// One walk x -> x^2 + c. Returns the gcd it ends with: a proper factor, n when the walk
-// closed its cycle modulo every factor at once, or 0 when stopped.
-std::uint64_t walk(const Montgomery& mont, std::uint64_t c, std::uint64_t start,
-                   const StopSignal& stop) {
-    const std::uint64_t n = mont.modulus();
-    auto step = [&](std::uint64_t v) { return mont.add(mont.mul(v, v), c); };
-    auto distance = [](std::uint64_t a, std::uint64_t b) { return a > b ? a - b : b - a; };
+struct Walk {
+    std::uint64_t c, x, y, saved, product;
+};
 
-    std::uint64_t y = start, x = start, saved = start;
-    std::uint64_t product = mont.one();
-    std::uint64_t g = 1;
-    for (std::uint64_t r = 1; g == 1; r *= 2) {
-        x = y;
-        for (std::uint64_t i = 0; i < r; ++i) y = step(y);
-        for (std::uint64_t k = 0; k < r && g == 1; k += kBatch) {
+// Result of a round of walks: a proper factor, n when every walk that closed its cycle did so
+// modulo all factors at once, or 0 when stopped.
+std::uint64_t search(std::uint64_t n, std::uint64_t firstC, const StopSignal& stop) {
+    const LazyMontgomery mont(n);
+    const std::uint64_t fourN = 4 * n;
+    std::array<Walk, kWalks> walks;
+    for (int w = 0; w < kWalks; ++w) walks[w] = {firstC + w, 2, 2, 2, 1};
+    auto step = [&](std::uint64_t v, std::uint64_t c) { return mont.mul(v, v) + c; };
+    // x and y lie in [0, 4n), so this is a positive residue of x - y below 8n.
+    auto difference = [&](std::uint64_t x, std::uint64_t y) { return x + fourN - y; };
+
+    for (std::uint64_t r = 1;; r *= 2) {
+        for (Walk& w : walks) w.x = w.y;
+        for (std::uint64_t i = 0; i < r; ++i) {
+            for (Walk& w : walks) w.y = step(w.y, w.c);
+        }
+        for (std::uint64_t k = 0; k < r; k += kBatch) {
             if (stop.requested()) return 0;
-            saved = y;
             const std::uint64_t steps = r - k < kBatch ? r - k : kBatch;
+            for (Walk& w : walks) w.saved = w.y;
             for (std::uint64_t i = 0; i < steps; ++i) {
-                y = step(y);
-                product = mont.mul(product, distance(x, y));
+                for (Walk& w : walks) {
+                    w.y = step(w.y, w.c);
+                    w.product = mont.mul(w.product, difference(w.x, w.y));
+                }
             }
-            g = binaryGcd(product, n);
+            bool closed = false;
+            for (Walk& w : walks) {
+                std::uint64_t g = binaryGcd(w.product, n);
+                if (g == 1) continue;
+                if (g == n) {
+                    // The batch went past the point where the factors part; walk it again
+                    // one step at a time.
+                    do {
+                        w.saved = step(w.saved, w.c);
+                        g = binaryGcd(difference(w.x, w.saved), n);
+                    } while (g == 1);
+                }
+                if (g != n) return g;
+                closed = true;
+            }
+            if (closed) return n;
         }
     }
-    if (g == n) {
-        // The batch went past the point where the factors part; walk it again one by one.
-        do {
-            saved = step(saved);
-            g = binaryGcd(distance(x, saved), n);
-        } while (g == 1);
-    }
-    return g;
 }
 
 }  // namespace
 
 std::uint64_t PollardBrentFactor(std::uint64_t n, const StopSignal& stop) {
-    const Montgomery mont(n);
-    for (std::uint64_t c = 1;; ++c) {
-        const std::uint64_t g = walk(mont, c, mont.toForm(2), stop);
-        if (g == 0) return 0;
+    for (std::uint64_t c = 1;; c += kWalks) {
+        const std::uint64_t g = search(n, c, stop);
         if (g != n) return g;
     }
 }
