@@ -26,7 +26,9 @@ void writeAll(int fd, std::string_view data) {
 
 class Batch {
 public:
-    Batch(Context& ctx, const EntryWork& work) : ctx_(ctx), work_(work) { out_.reserve(2 * kFlushSize); }
+    Batch(Context& ctx, const EntryWork& work) : ctx_(ctx), work_(work) {
+        out_.reserve(2 * kFlushSize);
+    }
     ~Batch() { flush(); }
 
     // False when the batch has to end.

@@ -48,6 +48,8 @@ constexpr auto makeTrialPrimes() {
 
 inline constexpr auto kTrialPrimes = detail::makeTrialPrimes();
 
-inline bool dividesExactly(std::uint64_t n, const TrialPrime& p) { return n * p.inverse <= p.limit; }
+inline bool dividesExactly(std::uint64_t n, const TrialPrime& p) {
+    return n * p.inverse <= p.limit;
+}
 
 }  // namespace tarn

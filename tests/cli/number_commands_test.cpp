@@ -31,8 +31,7 @@ CliRun runCli(const std::string& arguments, const std::string& input = "") {
     return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, readFile(out), readFile(err)};
 }
 
-const std::string kRange =
-    "Value out of range. Value must be between 2 and 922 337 203 685 277.\n";
+const std::string kRange = "Value out of range. Value must be between 2 and 922 337 203 685 277.\n";
 
 }  // namespace
 
@@ -85,4 +84,25 @@ TEST(CliTest, ReadsStandardInput) {
     EXPECT_EQ(r.exitCode, 2);
     EXPECT_EQ(r.out, "Number 2 is prime.\nNumber 9 is not prime.\nNumber 127 is prime.\n");
     EXPECT_EQ(r.err, kRange);
+}
+
+TEST(CliFactorize, InterruptEndsTheBatchWithExitCodeThree) {
+    // Far more hard numbers than a fifth of a second can factorize; SIGINT comes after that.
+    TempFolder folder;
+    std::string input;
+    for (int i = 0; i < 400000; ++i) input += "922335988900189\n";
+    writeFile(folder.path() + "in.txt", input);
+    const std::string command = std::string("timeout --preserve-status -s INT 0.2 '") +
+                                TARN_CLI_PATH + "' factorize < '" + folder.path() + "in.txt' > '" +
+                                folder.path() + "out.txt'";
+    const int status = std::system(command.c_str());
+    ASSERT_TRUE(WIFEXITED(status));
+    EXPECT_EQ(WEXITSTATUS(status), 3);
+    // Whatever was done is there, in whole lines.
+    const std::string out = readFile(folder.path() + "out.txt");
+    EXPECT_LT(out.size(), input.size() * 2);
+    if (!out.empty()) {
+        EXPECT_EQ(out.back(), '\n');
+        EXPECT_EQ(out.substr(0, out.find('\n')), "922335988900189 = 30369979 * 30369991");
+    }
 }

@@ -1,11 +1,12 @@
 // FactorizeNumber against naive trial division, on random numbers over the whole range and on
 // the hard kinds (prime squares and cubes, balanced semiprimes, powers of 2, the top of the
 // range); the result lines character for character; stop requests.
+#include "core/factorization.hpp"
+
 #include <gtest/gtest.h>
 
 #include <random>
 
-#include "core/factorization.hpp"
 #include "core/trial_division.hpp"
 
 using namespace tarn;
@@ -110,10 +111,9 @@ TEST(FactorizeNumber, HardCases) {
     // Three primes near the cube root of the range.
     {
         const auto ps = primesFrom(96000, 3);
-        EXPECT_EQ(factors(ps[0] * ps[1] * ps[2]),
-                  (FactorList{{std::uint64_t(ps[0]), 1},
-                              {std::uint64_t(ps[1]), 1},
-                              {std::uint64_t(ps[2]), 1}}));
+        EXPECT_EQ(factors(ps[0] * ps[1] * ps[2]), (FactorList{{std::uint64_t(ps[0]), 1},
+                                                              {std::uint64_t(ps[1]), 1},
+                                                              {std::uint64_t(ps[2]), 1}}));
     }
     for (unsigned k = 1; k < 50; ++k) {
         EXPECT_EQ(factors(std::int64_t{1} << k), (FactorList{{2, k}}));
@@ -125,11 +125,15 @@ TEST(FactorizeNumber, HardCases) {
 }
 
 TEST(FactorizeNumber, ResultLines) {
-    const std::pair<std::int64_t, const char*> lines[] = {
-        {2, "2 = 2"},         {12, "12 = 2^2 * 3"},   {18, "18 = 2 * 3^2"},
-        {97, "97 = 97"},      {360, "360 = 2^3 * 3^2 * 5"},
-        {1001, "1001 = 7 * 11 * 13"},               {1024, "1024 = 2^10"},
-        {50, "50 = 2 * 5^2"}, {421053653, "421053653 = 20149 * 20897"}};
+    const std::pair<std::int64_t, const char*> lines[] = {{2, "2 = 2"},
+                                                          {12, "12 = 2^2 * 3"},
+                                                          {18, "18 = 2 * 3^2"},
+                                                          {97, "97 = 97"},
+                                                          {360, "360 = 2^3 * 3^2 * 5"},
+                                                          {1001, "1001 = 7 * 11 * 13"},
+                                                          {1024, "1024 = 2^10"},
+                                                          {50, "50 = 2 * 5^2"},
+                                                          {421053653, "421053653 = 20149 * 20897"}};
     for (const auto& [n, line] : lines) EXPECT_EQ(factorizationLine(n, factors(n)), line);
 }
 

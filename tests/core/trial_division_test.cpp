@@ -1,5 +1,7 @@
 // TestPrime2 and CheckPrime against a plain sieve, against each other across the whole entry
 // range, on the described edge cases, and with stop requests.
+#include "core/trial_division.hpp"
+
 #include <gtest/gtest.h>
 
 #include <chrono>
@@ -7,8 +9,6 @@
 #include <random>
 #include <thread>
 #include <vector>
-
-#include "core/trial_division.hpp"
 
 using namespace tarn;
 
@@ -100,9 +100,24 @@ TEST(TestPrime2, DescribedEdgeCases) {
         std::int64_t n;
         int code;
     };
-    for (const Case& c : {Case{1, 1}, {2, 0}, {4, 0}, {3, 1}, {5, 1}, {7, 1}, {9, 0}, {25, 0},
-                          {49, 0}, {11, 1}, {13, 1}, {97, 1}, {121, 0}, {127, 1}, {961, 0},
-                          {1681, 0}, {922337203685123, 1}, {kUpper, 0}}) {
+    for (const Case& c : {Case{1, 1},
+                          {2, 0},
+                          {4, 0},
+                          {3, 1},
+                          {5, 1},
+                          {7, 1},
+                          {9, 0},
+                          {25, 0},
+                          {49, 0},
+                          {11, 1},
+                          {13, 1},
+                          {97, 1},
+                          {121, 0},
+                          {127, 1},
+                          {961, 0},
+                          {1681, 0},
+                          {922337203685123, 1},
+                          {kUpper, 0}}) {
         EXPECT_EQ(testFresh(c.n), c.code) << "n = " << c.n;
         EXPECT_EQ(CheckPrime(c.n), c.code == kPrime) << "n = " << c.n;
     }

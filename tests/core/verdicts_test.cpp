@@ -1,8 +1,9 @@
 // The Test command's verdict messages.
+#include "core/verdicts.hpp"
+
 #include <gtest/gtest.h>
 
 #include "core/command_texts.hpp"
-#include "core/verdicts.hpp"
 
 using namespace tarn;
 
