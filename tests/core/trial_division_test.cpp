@@ -1,5 +1,5 @@
 // TestPrime2 and CheckPrime against a plain sieve, against each other across the whole entry
-// range, on the described edge cases, and with stop requests.
+// range, on the edge cases of the wheel and its bound, and with stop requests.
 #include "core/trial_division.hpp"
 
 #include <gtest/gtest.h>
@@ -95,7 +95,7 @@ TEST(CheckPrime, RejectsStrongPseudoprimes) {
     }
 }
 
-TEST(TestPrime2, DescribedEdgeCases) {
+TEST(TestPrime2, EdgeCasesOfTheWheelAndItsBound) {
     struct Case {
         std::int64_t n;
         int code;
