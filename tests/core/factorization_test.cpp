@@ -1,0 +1,155 @@
+// FactorizeNumber against naive trial division, on random numbers over the whole range and on
+// the hard kinds (prime squares and cubes, balanced semiprimes, powers of 2, the top of the
+// range); the result lines character for character; stop requests.
+#include "core/factorization.hpp"
+
+#include <gtest/gtest.h>
+
+#include <random>
+
+#include "core/trial_division.hpp"
+
+using namespace tarn;
+
+namespace {
+
+constexpr std::int64_t kUpper = 922337203685277;
+
+FactorList naiveFactors(std::uint64_t n) {
+    FactorList out;
+    for (std::uint64_t d = 2; d * d <= n; ++d) {
+        unsigned e = 0;
+        while (n % d == 0) n /= d, ++e;
+        if (e > 0) out.push_back({d, e});
+    }
+    if (n > 1) out.push_back({n, 1});
+    return out;
+}
+
+FactorList factors(std::int64_t n) {
+    StopSignal stop;
+    const auto result = FactorizeNumber(n, stop);
+    EXPECT_TRUE(result.has_value()) << n;
+    return result.value_or(FactorList{});
+}
+
+// The list is a factorization of n: ascending primes, each once, multiplying back to n.
+void expectSound(std::int64_t n) {
+    const FactorList list = factors(n);
+    ASSERT_FALSE(list.empty()) << n;
+    std::uint64_t product = 1;
+    std::uint64_t previous = 1;
+    for (const FactorEntry& e : list) {
+        ASSERT_GT(e.prime, previous) << n;
+        // CheckPrime keeps the trial division's verdict on 2 (not prime), so 2 is taken apart.
+        ASSERT_TRUE(e.prime == 2 || CheckPrime(static_cast<std::int64_t>(e.prime))) << n;
+        ASSERT_GE(e.exponent, 1u);
+        for (unsigned i = 0; i < e.exponent; ++i) product *= e.prime;
+        previous = e.prime;
+    }
+    EXPECT_EQ(product, static_cast<std::uint64_t>(n)) << factorizationLine(n, list);
+}
+
+std::vector<std::int64_t> primesFrom(std::int64_t start, int count) {
+    std::vector<std::int64_t> out;
+    for (std::int64_t p = start; static_cast<int>(out.size()) < count; ++p) {
+        if (p > 2 && CheckPrime(p)) out.push_back(p);
+    }
+    return out;
+}
+
+}  // namespace
+
+TEST(FactorizeNumber, AgreesWithNaiveTrialDivisionForSmallNumbers) {
+    for (std::int64_t n = 2; n < 200000; ++n) {
+        ASSERT_EQ(factors(n), naiveFactors(static_cast<std::uint64_t>(n))) << n;
+    }
+}
+
+TEST(FactorizeNumber, RandomNumbersAcrossTheRange) {
+    std::mt19937_64 random(11);
+    std::uniform_int_distribution<std::int64_t> pick(2, kUpper);
+    for (int i = 0; i < 3000; ++i) expectSound(pick(random));
+    // Against naive trial division where that stays cheap (below 10^12).
+    std::uniform_int_distribution<std::int64_t> smaller(2, 1000000000000);
+    for (int i = 0; i < 50; ++i) {
+        const std::int64_t n = smaller(random);
+        EXPECT_EQ(factors(n), naiveFactors(static_cast<std::uint64_t>(n))) << n;
+    }
+}
+
+TEST(FactorizeNumber, HardCases) {
+    // The largest primes whose square fits, and primes just past the trial divisors.
+    int squares = 0;
+    for (std::int64_t p : primesFrom(30369800, 12)) {
+        if (p * p > kUpper) continue;
+        ++squares;
+        EXPECT_EQ(factors(p * p), (FactorList{{std::uint64_t(p), 2}}));
+    }
+    EXPECT_GE(squares, 3);
+    for (std::int64_t p : primesFrom(2040, 6)) {
+        EXPECT_EQ(factors(p * p), (FactorList{{std::uint64_t(p), 2}}));
+        EXPECT_EQ(factors(p * p * p), (FactorList{{std::uint64_t(p), 3}}));
+    }
+    // Cubes of the largest primes whose cube fits, and a square times a prime.
+    for (std::int64_t p : primesFrom(97000, 5)) {
+        if (p * p * p > kUpper) continue;
+        EXPECT_EQ(factors(p * p * p), (FactorList{{std::uint64_t(p), 3}}));
+    }
+    {
+        const auto ps = primesFrom(100000, 2);
+        const std::int64_t n = ps[0] * ps[0] * ps[1];
+        EXPECT_EQ(factors(n), (FactorList{{std::uint64_t(ps[0]), 2}, {std::uint64_t(ps[1]), 1}}));
+    }
+    // Products of two primes near 3e7.
+    const auto low = primesFrom(29000000, 10);
+    const auto high = primesFrom(30000000, 10);
+    for (std::size_t i = 0; i < low.size(); ++i) {
+        EXPECT_EQ(factors(low[i] * high[i]),
+                  (FactorList{{std::uint64_t(low[i]), 1}, {std::uint64_t(high[i]), 1}}));
+    }
+    // Three primes near the cube root of the range.
+    {
+        const auto ps = primesFrom(96000, 3);
+        EXPECT_EQ(factors(ps[0] * ps[1] * ps[2]), (FactorList{{std::uint64_t(ps[0]), 1},
+                                                              {std::uint64_t(ps[1]), 1},
+                                                              {std::uint64_t(ps[2]), 1}}));
+    }
+    for (unsigned k = 1; k < 50; ++k) {
+        EXPECT_EQ(factors(std::int64_t{1} << k), (FactorList{{2, k}}));
+    }
+    for (std::int64_t n = kUpper; n > kUpper - 300; --n) expectSound(n);
+    EXPECT_EQ(factors(421053653), (FactorList{{20149, 1}, {20897, 1}}));
+    EXPECT_EQ(factors(kUpper), (FactorList{{3, 1}, {47, 1}, {761, 1}, {35527, 1}, {241951, 1}}));
+    EXPECT_EQ(factors(922337203685123), (FactorList{{922337203685123, 1}}));
+}
+
+TEST(FactorizeNumber, ResultLines) {
+    const std::pair<std::int64_t, const char*> lines[] = {{2, "2 = 2"},
+                                                          {12, "12 = 2^2 * 3"},
+                                                          {18, "18 = 2 * 3^2"},
+                                                          {97, "97 = 97"},
+                                                          {360, "360 = 2^3 * 3^2 * 5"},
+                                                          {1001, "1001 = 7 * 11 * 13"},
+                                                          {1024, "1024 = 2^10"},
+                                                          {50, "50 = 2 * 5^2"},
+                                                          {421053653, "421053653 = 20149 * 20897"}};
+    for (const auto& [n, line] : lines) EXPECT_EQ(factorizationLine(n, factors(n)), line);
+}
+
+TEST(FactorizeNumber, StopRequestGivesNothing) {
+    StopSignal stop;
+    stop.request();
+    const auto p = primesFrom(30000000, 2);
+    EXPECT_FALSE(FactorizeNumber(p[0] * p[1], stop).has_value());
+    EXPECT_FALSE(FactorizeNumber(360, stop).has_value());
+    EXPECT_TRUE(stop.requested());
+    stop.clear();
+    EXPECT_TRUE(FactorizeNumber(p[0] * p[1], stop).has_value());
+}
+
+TEST(FactorizeNumber, BelowTwoTheListIsEmpty) {
+    StopSignal stop;
+    EXPECT_EQ(FactorizeNumber(1, stop), FactorList{});
+    EXPECT_EQ(FactorizeNumber(0, stop), FactorList{});
+}

@@ -1,0 +1,152 @@
+// TestPrime2 and CheckPrime against a plain sieve, against each other across the whole entry
+// range, on the edge cases of the wheel and its bound, and with stop requests.
+#include "core/trial_division.hpp"
+
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <cmath>
+#include <random>
+#include <thread>
+#include <vector>
+
+using namespace tarn;
+
+namespace {
+
+constexpr std::int64_t kUpper = 922337203685277;
+
+std::vector<bool> sieve(std::size_t limit) {
+    std::vector<bool> prime(limit + 1, true);
+    prime[0] = prime[1] = false;
+    for (std::size_t p = 2; p * p <= limit; ++p) {
+        if (!prime[p]) continue;
+        for (std::size_t m = p * p; m <= limit; m += p) prime[m] = false;
+    }
+    return prime;
+}
+
+// The code the trial division must give: 1 and the primes from 3 up pass, 2 does not.
+int expectedCode(std::int64_t n, bool isPrime) {
+    if (n == 1) return kPrime;
+    if (n == 2) return kComposite;
+    return isPrime ? kPrime : kComposite;
+}
+
+int testFresh(std::int64_t n) {
+    StopSignal stop;
+    return TestPrime2(n, stop);
+}
+
+}  // namespace
+
+TEST(TestPrime2, AgreesWithASieveBelowOneMillion) {
+    const std::int64_t limit = 1000000;
+    const std::vector<bool> prime = sieve(limit);
+    StopSignal stop;
+    for (std::int64_t n = 1; n < limit; ++n) {
+        const int expected = expectedCode(n, prime[n]);
+        ASSERT_EQ(TestPrime2(n, stop), expected) << "n = " << n;
+        ASSERT_EQ(CheckPrime(n), expected == kPrime) << "n = " << n;
+    }
+}
+
+TEST(CheckPrime, AgreesWithASegmentSieveAtTheTopOfTheRange) {
+    // Every number of the last 200 000 below the upper bound, sieved by the primes up to its
+    // square root: a differential check where the pseudoprimes of the strong tests would live.
+    const std::int64_t low = kUpper - 200000;
+    const auto root = static_cast<std::size_t>(std::sqrt(static_cast<double>(kUpper))) + 1;
+    const std::vector<bool> base = sieve(root);
+    std::vector<bool> prime(static_cast<std::size_t>(kUpper - low + 1), true);
+    for (std::size_t p = 2; p <= root; ++p) {
+        if (!base[p]) continue;
+        const std::int64_t pp = static_cast<std::int64_t>(p);
+        for (std::int64_t m = (low + pp - 1) / pp * pp; m <= kUpper; m += pp)
+            prime[static_cast<std::size_t>(m - low)] = false;
+    }
+    int primes = 0;
+    for (std::int64_t n = low; n <= kUpper; ++n) {
+        const bool expected = prime[static_cast<std::size_t>(n - low)];
+        primes += expected ? 1 : 0;
+        ASSERT_EQ(CheckPrime(n), expected) << "n = " << n;
+    }
+    EXPECT_GT(primes, 5000);
+}
+
+TEST(CheckPrime, AgreesWithTrialDivisionOnRandomLargeNumbers) {
+    std::mt19937_64 random(7);
+    std::uniform_int_distribution<std::int64_t> pick(1000000, kUpper);
+    int primes = 0;
+    for (int i = 0; i < 300; ++i) {
+        const std::int64_t n = pick(random) | 1;  // odd, so that some of them are prime
+        const int code = testFresh(n);
+        primes += code == kPrime ? 1 : 0;
+        ASSERT_EQ(CheckPrime(n), code == kPrime) << "n = " << n;
+    }
+    EXPECT_GT(primes, 5);
+}
+
+TEST(CheckPrime, RejectsStrongPseudoprimes) {
+    // Strong pseudoprimes to the first several prime bases; all composite.
+    for (std::int64_t n : {2047LL, 1373653LL, 25326001LL, 3215031751LL, 2152302898747LL,
+                           3474749660383LL, 341550071728321LL, 561LL, 41041LL, 825265LL}) {
+        EXPECT_FALSE(CheckPrime(n)) << n;
+        EXPECT_EQ(testFresh(n), kComposite) << n;
+    }
+}
+
+TEST(TestPrime2, EdgeCasesOfTheWheelAndItsBound) {
+    struct Case {
+        std::int64_t n;
+        int code;
+    };
+    for (const Case& c : {Case{1, 1},
+                          {2, 0},
+                          {4, 0},
+                          {3, 1},
+                          {5, 1},
+                          {7, 1},
+                          {9, 0},
+                          {25, 0},
+                          {49, 0},
+                          {11, 1},
+                          {13, 1},
+                          {97, 1},
+                          {121, 0},
+                          {127, 1},
+                          {961, 0},
+                          {1681, 0},
+                          {922337203685123, 1},
+                          {kUpper, 0}}) {
+        EXPECT_EQ(testFresh(c.n), c.code) << "n = " << c.n;
+        EXPECT_EQ(CheckPrime(c.n), c.code == kPrime) << "n = " << c.n;
+    }
+}
+
+TEST(TestPrime2, ClearsAStopRequestMadeBeforeTheCall) {
+    StopSignal stop;
+    stop.request();
+    EXPECT_EQ(TestPrime2(1000003, stop), kPrime);
+    EXPECT_FALSE(stop.requested());
+    stop.request();
+    EXPECT_EQ(TestPrime2(1681, stop), kComposite);
+    EXPECT_FALSE(stop.requested());
+}
+
+TEST(TestPrime2, StopsWhenAskedDuringTheWheel) {
+    // A prime near the upper bound keeps the wheel busy for a million turns. The request comes
+    // from another thread a little after the call has begun; on a very busy machine the call
+    // might clear it on entry, so a few attempts are allowed.
+    int code = kPrime;
+    StopSignal stop;
+    for (int attempt = 0; attempt < 5 && code != kStopped; ++attempt) {
+        std::thread asker([&stop] {
+            std::this_thread::sleep_for(std::chrono::milliseconds(3));
+            stop.request();
+        });
+        code = TestPrime2(922337203685123, stop);
+        asker.join();
+    }
+    EXPECT_EQ(code, kStopped);
+    EXPECT_TRUE(stop.requested());
+}
