@@ -7,10 +7,14 @@
 namespace tarn {
 
 int TestPrime2(std::int64_t n, StopSignal& stop) {
+    stop.clear();
+    return trialDivisionTest(n, stop);
+}
+
+int trialDivisionTest(std::int64_t n, const StopSignal& stop) {
     // The bound is taken on the double, as the Test command always has: Fix(sqrt n) + 1.
     const std::uint64_t bound =
         n > 0 ? static_cast<std::uint64_t>(std::sqrt(static_cast<double>(n))) + 1 : 0;
-    stop.clear();
     if (n < 1) return kComposite;
     const auto m = static_cast<std::uint64_t>(n);
 

@@ -20,6 +20,10 @@ enum TestCode : int { kComposite = 0, kPrime = 1, kStopped = 2 };
 // Numbers below 1 are reported composite.
 int TestPrime2(std::int64_t n, StopSignal& stop);
 
+// The same test without clearing the stop request first. The window clears it on its own
+// thread when the command starts, so that a stop pressed before the worker gets going counts.
+int trialDivisionTest(std::int64_t n, const StopSignal& stop);
+
 // True exactly when TestPrime2 would return 1: so true for 1 and for primes from 3 up, false
 // for 2 and for composites. Decided by deterministic Miller-Rabin, without any stop request.
 bool CheckPrime(std::int64_t n);
