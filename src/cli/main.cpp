@@ -3,20 +3,25 @@
 
 #include "cli/cli_context.hpp"
 #include "core/app_folder.hpp"
+#include "core/data_folder.hpp"
 
 int main(int argc, char** argv) {
     tarn::StopSignal stop;
-    tarn::cli::Context ctx{tarn::AppFolder(), stop};
+    tarn::cli::Context ctx{{}, stop};
+    const std::string programFolder = tarn::AppFolder();
 
     CLI::App app{"Tarn: generate, test, factorize and split prime numbers.", "tarn-cli"};
     app.set_version_flag("--version", std::string("tarn-cli ") + TARN_VERSION);
     app.require_subcommand(0, 1);
     std::string folder;
     app.add_option("--folder", folder,
-                   "Folder of primes.txt and primes.ini (default: the program's folder)")
-        ->check(CLI::ExistingDirectory);
+                   "Folder of primes.txt and primes.ini (default: the program's folder, or the "
+                   "user's data folder for an installed copy)")
+        ->check(CLI::ExistingDirectory)
+        ->default_str(tarn::chooseDataFolder(programFolder, tarn::currentSurroundings()));
     app.parse_complete_callback([&] {
-        if (!folder.empty()) ctx.folder = tarn::withTrailingSeparator(folder);
+        ctx.folder = folder.empty() ? tarn::dataFolder(programFolder)
+                                    : tarn::withTrailingSeparator(folder);
     });
 
     tarn::cli::registerNumberCommands(app, ctx);

@@ -62,7 +62,7 @@ void Form1::reportLaunch(const std::string& failure) {
 }
 
 void Form1::readme_Click() {
-    const std::string path = folder_ + kReadmeFileName;
+    const std::string path = readmePath_.empty() ? folder_ + kReadmeFileName : readmePath_;
     if (FileExists(path)) reportLaunch(shell_.openInTextEditor(path));
 }
 

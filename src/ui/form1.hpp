@@ -32,6 +32,8 @@ public:
     // `folder` holds primes.txt, primes.ini and README.txt (one trailing separator).
     Form1(MessageBox& messages, Shell& shell, std::string folder, QWidget* parent = nullptr);
     ~Form1() override;
+    // Where "Readme" looks instead of `folder`: an installed copy reads the installed one.
+    void setReadmePath(std::string path) { readmePath_ = std::move(path); }
 
     // Start-up: the checkpoint is made sure of and the user told about a stopped job.
     // Runs before the window is first shown.
@@ -84,6 +86,7 @@ private:
     MessageBox& messages_;
     Shell& shell_;
     std::string folder_;
+    std::string readmePath_;  // empty: README.txt in folder_
     QPointer<QWidget> splitWindow_;
 
     // Test/Factorize and the jobs have stop requests of their own, so that a test started
