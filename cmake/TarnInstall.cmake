@@ -1,0 +1,48 @@
+# Installation: the GNU layout (bin/, share/doc/tarn/, share/applications/, share/icons/hicolor/,
+# share/metainfo/) for `cmake --install`, and a Debian package from `cpack -G DEB`.
+# The programs find their read-me and tell an installed copy from a portable one by paths
+# relative to their own folder, so a prefix moved after installation still works.
+
+include(GNUInstallDirs)
+# Debian names documentation folders after the package, in lower case; GNUInstallDirs (brought
+# in early by Qt's package files) names it after the project unless told otherwise.
+if(CMAKE_INSTALL_DOCDIR STREQUAL "${CMAKE_INSTALL_DATAROOTDIR}/doc/${PROJECT_NAME}")
+    set(CMAKE_INSTALL_DOCDIR "${CMAKE_INSTALL_DATAROOTDIR}/doc/tarn")
+    GNUInstallDirs_get_absolute_install_dir(CMAKE_INSTALL_FULL_DOCDIR CMAKE_INSTALL_DOCDIR DOCDIR)
+endif()
+
+file(RELATIVE_PATH TARN_DOC_FROM_BIN "${CMAKE_INSTALL_FULL_BINDIR}" "${CMAKE_INSTALL_FULL_DOCDIR}")
+file(RELATIVE_PATH TARN_DATAROOT_FROM_BIN
+    "${CMAKE_INSTALL_FULL_BINDIR}" "${CMAKE_INSTALL_FULL_DATAROOTDIR}")
+set_property(SOURCE src/core/data_folder.cpp APPEND PROPERTY COMPILE_DEFINITIONS
+    TARN_DOC_FROM_BIN="${TARN_DOC_FROM_BIN}" TARN_DATAROOT_FROM_BIN="${TARN_DATAROOT_FROM_BIN}")
+
+install(TARGETS tarn-cli RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+install(FILES README.md DESTINATION ${CMAKE_INSTALL_DOCDIR} RENAME README.txt)
+
+set(TARN_APP_ID example.brindle.tarn)
+if(TARGET tarn)
+    install(TARGETS tarn RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+    install(FILES data/tarn.desktop DESTINATION ${CMAKE_INSTALL_DATADIR}/applications)
+    install(FILES data/${TARN_APP_ID}.metainfo.xml DESTINATION ${CMAKE_INSTALL_DATADIR}/metainfo)
+    install(FILES src/ui/tarn.svg DESTINATION ${CMAKE_INSTALL_DATADIR}/icons/hicolor/scalable/apps)
+    install(FILES src/ui/tarn.png DESTINATION ${CMAKE_INSTALL_DATADIR}/icons/hicolor/32x32/apps)
+endif()
+
+set(CPACK_PACKAGE_NAME tarn)
+set(CPACK_PACKAGE_VENDOR Brindle)
+set(CPACK_PACKAGE_CONTACT "Brindle <tarn@brindle.example>")
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "Generate, test and factorize prime numbers")
+set(CPACK_PACKAGE_DESCRIPTION "Tarn generates every prime up to a limit into a text file, \
+resumes a stopped job, tests and factorizes numbers and splits the results file. \
+The command-line program tarn-cli does the same from a terminal.")
+set(CPACK_PACKAGE_HOMEPAGE_URL "https://brindle.example")
+set(CPACK_STRIP_FILES ON)
+set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
+set(CPACK_DEBIAN_PACKAGE_SECTION math)
+# Depends: from the libraries the programs link (Qt 6, GLib, the C++ runtime).
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
+if(NOT WIN32)
+    set(CPACK_GENERATOR DEB)
+endif()
+include(CPack)
