@@ -18,7 +18,8 @@ namespace {
 fs::path modulePath() {
     std::wstring buffer(MAX_PATH, L'\0');
     for (;;) {
-        const DWORD n = GetModuleFileNameW(nullptr, buffer.data(), static_cast<DWORD>(buffer.size()));
+        const DWORD size = static_cast<DWORD>(buffer.size());
+        const DWORD n = GetModuleFileNameW(nullptr, buffer.data(), size);
         if (n == 0) return {};
         if (n < buffer.size()) {
             buffer.resize(n);

@@ -15,8 +15,9 @@ namespace tarn {
 // hand in tests.
 struct Surroundings {
     std::function<bool(const std::string& folder)> folderWritable;
-    std::optional<std::string> xdgDataHome;  // XDG_DATA_HOME (Windows: LOCALAPPDATA); nullopt if unset
-    std::optional<std::string> home;         // HOME (Windows: USERPROFILE); nullopt if unset
+    // XDG_DATA_HOME and HOME (Windows: LOCALAPPDATA and USERPROFILE); nullopt when unset.
+    std::optional<std::string> xdgDataHome;
+    std::optional<std::string> home;
 };
 Surroundings currentSurroundings();
 

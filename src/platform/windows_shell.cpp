@@ -73,13 +73,13 @@ std::string WindowsShell::openUrl(const std::string& url) {
         ShellExecuteW(nullptr, L"open", address.c_str(), nullptr, nullptr, SW_SHOWMAXIMIZED);
     // Values above 32 mean success; the reason of a failure is left in GetLastError.
     if (reinterpret_cast<INT_PTR>(result) > 32) return {};
-    return "The web browser could not be started for " + url + ": " +
-           systemMessage(GetLastError());
+    return "The web browser could not be started for " + url + ": " + systemMessage(GetLastError());
 }
 
 std::string WindowsShell::documentsFolder() {
     PWSTR folder = nullptr;
-    const HRESULT result = SHGetKnownFolderPath(FOLDERID_Documents, KF_FLAG_DEFAULT, nullptr, &folder);
+    const HRESULT result =
+        SHGetKnownFolderPath(FOLDERID_Documents, KF_FLAG_DEFAULT, nullptr, &folder);
     std::wstring path = SUCCEEDED(result) && folder ? std::wstring(folder) : std::wstring();
     CoTaskMemFree(folder);
     if (path.empty()) {

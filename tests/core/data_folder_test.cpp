@@ -1,5 +1,7 @@
 // Where a portable and an installed copy keep primes.txt and primes.ini, and which README.txt
 // "Readme" opens.
+#include "core/data_folder.hpp"
+
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -8,7 +10,6 @@
 #include <filesystem>
 #include <optional>
 
-#include "core/data_folder.hpp"
 #include "support/temp_folder.hpp"
 
 using namespace tarn;
