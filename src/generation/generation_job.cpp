@@ -216,11 +216,12 @@ private:
 
 // Sieves and formats turns [first, end) into the pipeline; returns the turn it stopped before.
 std::int64_t produce(Pipeline& pipeline, WheelSieve& sieve, RecordFormatter& formatter,
-                     std::int64_t& count, std::int64_t first, std::int64_t end,
-                     std::int64_t limit, const StopSignal& stop, const JobHooks& hooks,
-                     JobProgress* progress, Buffer* buffer, bool& stopped) {
+                     std::int64_t& count, std::int64_t first, std::int64_t end, std::int64_t limit,
+                     const StopSignal& stop, const JobHooks& hooks, JobProgress* progress,
+                     Buffer* buffer, bool& stopped) {
     const std::int64_t segmentTurns = hooks.turnsPerBatch > 0 ? hooks.turnsPerBatch : kSegmentTurns;
-    std::vector<std::uint8_t> segment(static_cast<std::size_t>(std::min(segmentTurns, std::max<std::int64_t>(end - first, 1))));
+    std::vector<std::uint8_t> segment(
+        static_cast<std::size_t>(std::min(segmentTurns, std::max<std::int64_t>(end - first, 1))));
     char* const data = buffer->bytes.data();
     char* out = data + buffer->size;
     // Room for one whole turn of records before a buffer is handed over.
@@ -315,8 +316,8 @@ JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progr
     }
 
     // A fresh file holds nothing yet; a continued one holds every prime before the first turn.
-    const Mark start = spec.append ? Mark{0, firstTurnStart - 4, spec.primeCountBefore}
-                                   : Mark{0, 0, 0};
+    const Mark start =
+        spec.append ? Mark{0, firstTurnStart - 4, spec.primeCountBefore} : Mark{0, 0, 0};
     const std::size_t bufferBytes =
         hooks.bufferBytes > 0 ? std::max<std::size_t>(hooks.bufferBytes, 4096) : kBufferBytes;
     if (progress) {
@@ -349,8 +350,8 @@ JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progr
                           progress, buffer, stopped);
         pipeline.finish();
 
-        const int failure = pipeline.writeError() != 0 ? pipeline.writeError()
-                                                       : pipeline.syncError();
+        const int failure =
+            pipeline.writeError() != 0 ? pipeline.writeError() : pipeline.syncError();
         if (pipeline.failed()) {
             result.status = JobResult::Status::Failed;
             if (failure != 0) {

@@ -48,7 +48,8 @@ private:
         high_ = value / 10000;
         low_ = value % 10000;
         highLength_ =
-            high_ == 0 ? 0 : static_cast<int>(std::to_chars(upper_, upper_ + 16, high_).ptr - upper_);
+            high_ == 0 ? 0
+                       : static_cast<int>(std::to_chars(upper_, upper_ + 16, high_).ptr - upper_);
     }
 
     std::uint64_t high_ = 0;

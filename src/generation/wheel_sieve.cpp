@@ -15,7 +15,8 @@ constexpr std::array<std::uint32_t, 8> kWheelStep{6, 4, 2, 4, 2, 4, 6, 2};
 constexpr std::array<std::uint8_t, 30> bitTable() {
     std::array<std::uint8_t, 30> table{};
     for (auto& v : table) v = 0;
-    for (std::uint32_t b = 0; b < 8; ++b) table[kTurnOffsets[b]] = static_cast<std::uint8_t>(1u << b);
+    for (std::uint32_t b = 0; b < 8; ++b)
+        table[kTurnOffsets[b]] = static_cast<std::uint8_t>(1u << b);
     return table;
 }
 constexpr std::array<std::uint8_t, 30> kBitOf = bitTable();
@@ -63,8 +64,8 @@ WheelSieve::WheelSieve(std::int64_t firstTurn, std::int64_t limit) : turn_(first
     const std::vector<std::uint32_t> primes = sievingPrimes(static_cast<std::uint32_t>(root));
     const auto start = static_cast<std::uint64_t>(turnStart(firstTurn));
     constexpr std::uint32_t kSmallBound = 1u << 15;
-    large_.reserve(static_cast<std::size_t>(
-        std::count_if(primes.begin(), primes.end(), [](std::uint32_t p) { return p >= kSmallBound; })));
+    large_.reserve(static_cast<std::size_t>(std::count_if(
+        primes.begin(), primes.end(), [](std::uint32_t p) { return p >= kSmallBound; })));
     for (const std::uint32_t p : primes) {
         // The first multiple to cross off: p * q with q prime to 30, q >= p and p * q >= start.
         const std::uint64_t lowest = std::max<std::uint64_t>(p, (start + p - 1) / p);
@@ -101,7 +102,8 @@ void WheelSieve::sieveNext(std::uint8_t* bytes, std::size_t turns) {
         }
     }
     const auto first = static_cast<std::uint64_t>(turn_);
-    const std::uint64_t end = static_cast<std::uint64_t>(turnStart(turn_ + static_cast<std::int64_t>(turns)));
+    const std::uint64_t end =
+        static_cast<std::uint64_t>(turnStart(turn_ + static_cast<std::int64_t>(turns)));
     for (Large& l : large_) {
         std::uint64_t m = l.multiple;
         if (m >= end) continue;

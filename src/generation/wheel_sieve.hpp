@@ -36,7 +36,7 @@ private:
     struct Large {
         std::uint64_t multiple;  // next multiple to cross off
         std::uint32_t p;
-        std::uint32_t wheel;     // position of the multiplier on the wheel of 30
+        std::uint32_t wheel;  // position of the multiplier on the wheel of 30
     };
 
     std::int64_t turn_;  // first turn of the next segment

@@ -52,8 +52,9 @@ TEST(GenerateCommand, RefusesBadEntriesWithoutTouchingFiles) {
     TempFolder folder;
     for (const auto& [arg, message] :
          {std::pair{"99.9", "Minimum value is 100\n"}, std::pair{"abc", "Invalid entry.\n"},
-          std::pair{"1.5", "Value out of range. Value must be between 2 and 922 337 203 685 "
-                           "277.\n"}}) {
+          std::pair{"1.5",
+                    "Value out of range. Value must be between 2 and 922 337 203 685 "
+                    "277.\n"}}) {
         const Outcome o = runCli(folder, std::string("generate ") + arg);
         EXPECT_EQ(o.code, 2) << arg;
         EXPECT_EQ(o.err, message);
@@ -68,8 +69,7 @@ TEST(GenerateCommand, WriteFailureExitsWithOne) {
     std::filesystem::create_symlink("/dev/full", folder.path() + "primes.txt");
     const Outcome o = runCli(folder, "generate 1000");
     EXPECT_EQ(o.code, 1);
-    EXPECT_EQ(o.err.rfind("The file " + folder.path() + "primes.txt could not be written: ", 0),
-              0u)
+    EXPECT_EQ(o.err.rfind("The file " + folder.path() + "primes.txt could not be written: ", 0), 0u)
         << o.err;
 }
 

@@ -1,12 +1,13 @@
 // The generation job against a plain sieve: byte-for-byte results files and checkpoint lines for
 // complete runs, stops after a chosen turn, continued (appended) runs, and the checkpoints written
 // while the job runs.
+#include "generation/generation_job.hpp"
+
 #include <gtest/gtest.h>
 
 #include <mutex>
 #include <random>
 
-#include "generation/generation_job.hpp"
 #include "generation/job_texts.hpp"
 #include "generation/prime_oracle.hpp"
 #include "support/temp_folder.hpp"
@@ -31,7 +32,7 @@ struct JobRun {
 };
 
 JobRun runIn(const TempFolder& folder, JobSpec spec, const JobHooks& hooks = {},
-        const StopSignal* stopSignal = nullptr) {
+             const StopSignal* stopSignal = nullptr) {
     spec.folder = folder.path();
     StopSignal idle;
     JobRun r;
@@ -89,8 +90,8 @@ TEST(GenerationJob, WorkedLimitsGiveTheDescribedFiles) {
 }
 
 TEST(GenerationJob, LimitsAroundTurnEdgesMatchThePlainSieve) {
-    for (const std::int64_t limit : {100LL, 110LL, 1000LL, 1206LL, 1207LL, 1208LL, 1210LL,
-                                     1211LL, 1212LL, 30 * 331 + 7LL, 30 * 331 + 11LL, 997LL}) {
+    for (const std::int64_t limit : {100LL, 110LL, 1000LL, 1206LL, 1207LL, 1208LL, 1210LL, 1211LL,
+                                     1212LL, 30 * 331 + 7LL, 30 * 331 + 11LL, 997LL}) {
         expectComplete(limit, false);
         expectComplete(limit, true);
     }
@@ -99,7 +100,8 @@ TEST(GenerationJob, LimitsAroundTurnEdgesMatchThePlainSieve) {
 TEST(GenerationJob, LimitsAcrossSegmentBoundariesMatchThePlainSieve) {
     // The first batch is one turn and the next 32768 turns; its end is turn 32769.
     const std::int64_t edge = 30 * 32769 + 11;
-    for (const std::int64_t limit : {edge - 1, edge, edge + 1, edge + 30}) expectComplete(limit, false);
+    for (const std::int64_t limit : {edge - 1, edge, edge + 1, edge + 30})
+        expectComplete(limit, false);
     // Small batches and small buffers hand many partial buffers to the writer.
     JobHooks hooks;
     hooks.turnsPerBatch = 7;
@@ -121,8 +123,8 @@ TEST(GenerationJob, StopAfterSomeTurnsLeavesWholeTurns) {
             SCOPED_TRACE(turns);
             TempFolder folder;
             StopSignal stop;
-            const JobRun r = runIn(folder, JobSpec{"", 100'000, enumerated}, stopAfter(stop, turns),
-                              &stop);
+            const JobRun r =
+                runIn(folder, JobSpec{"", 100'000, enumerated}, stopAfter(stop, turns), &stop);
             const std::int64_t last = 30 * turns + 7;
             ASSERT_EQ(r.result.status, JobResult::Status::Stopped);
             EXPECT_EQ(r.result.candidate, last);
@@ -162,8 +164,8 @@ TEST(GenerationJob, ContinuedJobGivesTheSameFileAsOneRun) {
             const JobRun first =
                 runIn(folder, JobSpec{"", limit, enumerated}, stopAfter(stop, turns), &stop);
             ASSERT_EQ(first.result.status, JobResult::Status::Stopped);
-            JobSpec next{"", limit, enumerated, true, first.result.candidate + 4,
-                         first.result.primeCount};
+            JobSpec next{
+                "", limit, enumerated, true, first.result.candidate + 4, first.result.primeCount};
             StopSignal idle;
             const JobRun second = runIn(folder, next);
             ASSERT_EQ(second.result.status, JobResult::Status::Completed) << second.result.error;

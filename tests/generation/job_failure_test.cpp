@@ -69,9 +69,8 @@ TEST(GenerationJobFailure, FullDiskLeavesWholeTurnsAndAContinuableCheckpoint) {
         for (const bool enumerated : {false, true}) {
             SCOPED_TRACE(capacity);
             TempFolder folder;
-            const JobResult failed =
-                runJob(JobSpec{folder.path(), limit, enumerated}, StopSignal{}, nullptr,
-                       fillingAt(capacity));
+            const JobResult failed = runJob(JobSpec{folder.path(), limit, enumerated}, StopSignal{},
+                                            nullptr, fillingAt(capacity));
             ASSERT_EQ(failed.status, JobResult::Status::Failed);
             EXPECT_EQ(failed.error.substr(0, failed.error.find(':')),
                       "The file " + folder.path() + "primes.txt could not be written");
@@ -86,10 +85,9 @@ TEST(GenerationJobFailure, FullDiskLeavesWholeTurnsAndAContinuableCheckpoint) {
             EXPECT_EQ(onDisk, expectedResults(oracle(), checkpoint->candidate, enumerated));
 
             // The checkpoint is a true one: continuing from it completes the file.
-            const JobResult resumed =
-                runJob(JobSpec{folder.path(), limit, enumerated, true, checkpoint->candidate + 4,
-                               failed.primeCount},
-                       StopSignal{});
+            const JobResult resumed = runJob(JobSpec{folder.path(), limit, enumerated, true,
+                                                     checkpoint->candidate + 4, failed.primeCount},
+                                             StopSignal{});
             ASSERT_EQ(resumed.status, JobResult::Status::Completed) << resumed.error;
             EXPECT_EQ(readFile(folder.path() + "primes.txt"),
                       expectedResults(oracle(), limit, enumerated));

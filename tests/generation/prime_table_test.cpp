@@ -1,8 +1,9 @@
 // PrimeTable and TestPrime: the worked cases, a differential run against trial division by
 // every odd number, and the growth cap at the top of the range.
+#include "generation/prime_table.hpp"
+
 #include <gtest/gtest.h>
 
-#include "generation/prime_table.hpp"
 #include "generation/prime_oracle.hpp"
 
 using namespace tarn;
