@@ -5,10 +5,15 @@
 #pragma once
 
 #include <atomic>
+#include <chrono>
 #include <cstdint>
+#include <functional>
+#include <memory>
 #include <string>
 
 #include "core/stop_signal.hpp"
+#include "generation/checkpoint_file.hpp"
+#include "generation/results_sink.hpp"
 
 namespace tarn {
 
@@ -42,6 +47,27 @@ struct JobResult {
 };
 
 JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress = nullptr);
+
+// Seams of the job for tests and measurements; the defaults are the real job.
+struct JobHooks {
+    // Opens the results file in place of openResultsFile (tests fail it at a chosen byte).
+    std::function<std::unique_ptr<ResultsSink>(const std::string& path, bool append, int& error)>
+        openResults;
+    // Runs on the sieving thread after each batch of wheel turns, before the stop check, with the
+    // count of turns finished since the job's first turn. The first batch is one turn.
+    std::function<void(std::int64_t turnsDone)> afterBatch;
+    // Runs after each checkpoint rewritten during the job, with the results bytes it covers
+    // (all of them flushed to the disk before the checkpoint was written).
+    std::function<void(const Checkpoint& checkpoint, std::uint64_t durableBytes)> afterCheckpoint;
+    std::chrono::milliseconds checkpointInterval{2000};
+    std::int64_t turnsPerBatch = 0;  // 0: sized for the first-level cache
+    std::size_t bufferBytes = 0;     // 0: 4 MiB per write
+    // false: no flush to the disk and no checkpoint during the job (measures their cost).
+    bool durable = true;
+};
+
+JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress,
+                 const JobHooks& hooks);
 
 // "Done!!! The results were saved in the file <path>. 25 primes found up to number 100...
 // Save the file to other location."

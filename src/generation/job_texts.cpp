@@ -1,0 +1,42 @@
+#include "generation/job_texts.hpp"
+
+#include <algorithm>
+
+#include "generation/generation_job.hpp"
+
+namespace tarn {
+
+std::optional<std::string> checkGenerationMinimum(std::int64_t whole) {
+    if (whole < kGenerationMinimum) return std::string(kMinimumMessage);
+    return std::nullopt;
+}
+
+std::optional<std::string> checkGenerationMinimum(const Number& number) {
+    return checkGenerationMinimum(number.whole());
+}
+
+std::string fileWriteFailure(const std::string& path, const std::string& reason) {
+    return "The file " + path + " could not be written: " + reason + ".";
+}
+
+std::string fileCreateFailure(const std::string& path, const std::string& reason) {
+    return "The file " + path + " could not be opened for writing: " + reason + ".";
+}
+
+namespace {
+// After a complete run the candidate stands above the limit; the report names the limit.
+std::int64_t reportedBound(const JobResult& r) { return std::min(r.candidate, r.limit); }
+}  // namespace
+
+std::string completionReport(const JobResult& r) {
+    return "Done!!! The results were saved in the file " + r.resultsPath + ". " +
+           std::to_string(r.primeCount) + " primes found up to number " +
+           std::to_string(reportedBound(r)) + "... Save the file to other location.";
+}
+
+std::string completionInfoLine(const JobResult& r) {
+    return "INFO: " + std::to_string(r.primeCount) + " primes found up to number " +
+           std::to_string(reportedBound(r)) + "...";
+}
+
+}  // namespace tarn

@@ -1,0 +1,25 @@
+// The messages of the generation job, word for word, and the job's own lower bound.
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+
+#include "core/number.hpp"
+
+namespace tarn {
+
+inline constexpr std::int64_t kGenerationMinimum = 100;
+inline constexpr std::string_view kMinimumMessage = "Minimum value is 100";
+inline constexpr std::string_view kStoppedMessage = "All calculations were stopped!";
+
+// "Minimum value is 100" for a whole number below 100, nothing otherwise.
+std::optional<std::string> checkGenerationMinimum(std::int64_t whole);
+std::optional<std::string> checkGenerationMinimum(const Number& number);
+
+// Failure texts: "The file <path> could not be written: <reason>."
+std::string fileWriteFailure(const std::string& path, const std::string& reason);
+std::string fileCreateFailure(const std::string& path, const std::string& reason);
+
+}  // namespace tarn

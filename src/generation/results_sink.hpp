@@ -1,0 +1,32 @@
+// Where the generation job puts its records: the results file, or a stand-in that tests make fail
+// at a chosen byte. Every call returns 0 or the system's error number. write() and sync() may run
+// on different threads at once (the writer and the checkpointer), as they can on one descriptor.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <string>
+
+namespace tarn {
+
+class ResultsSink {
+public:
+    virtual ~ResultsSink() = default;
+    // Writes all bytes (or fails); `written` receives how many reached the file.
+    virtual int write(const char* data, std::size_t size, std::size_t& written) = 0;
+    // Makes everything written so far durable (fdatasync).
+    virtual int sync() = 0;
+    // Asks the system to start writing [offset, offset + size) to the disk without waiting, so
+    // that the final sync has little left to do. Optional.
+    virtual void startWriteback(std::uint64_t /*offset*/, std::uint64_t /*size*/) {}
+    // Cuts the file back to `size` bytes (used to drop a torn record after a failed write).
+    virtual int truncate(std::uint64_t size) = 0;
+    virtual int close() = 0;
+};
+
+// Opens the results file for writing: truncated for a fresh job, positioned at its end for
+// `append`. Returns nothing and the error number on failure.
+std::unique_ptr<ResultsSink> openResultsFile(const std::string& path, bool append, int& error);
+
+}  // namespace tarn

@@ -1,0 +1,124 @@
+#include "generation/wheel_sieve.hpp"
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+
+namespace tarn {
+namespace {
+
+// Numbers prime to 30 in one period, and the steps from one to the next.
+constexpr std::array<std::uint32_t, 8> kWheel{1, 7, 11, 13, 17, 19, 23, 29};
+constexpr std::array<std::uint32_t, 8> kWheelStep{6, 4, 2, 4, 2, 4, 6, 2};
+
+// Bit of a number m prime to 30 inside its turn, by (m - 11) mod 30 (= (m + 19) mod 30).
+constexpr std::array<std::uint8_t, 30> bitTable() {
+    std::array<std::uint8_t, 30> table{};
+    for (auto& v : table) v = 0;
+    for (std::uint32_t b = 0; b < 8; ++b)
+        table[kTurnOffsets[b]] = static_cast<std::uint8_t>(1u << b);
+    return table;
+}
+constexpr std::array<std::uint8_t, 30> kBitOf = bitTable();
+
+// The smallest multiplier q >= from that is prime to 30, and its wheel position.
+std::uint64_t nextWheelNumber(std::uint64_t from, std::uint32_t& wheel) {
+    for (;; ++from) {
+        const auto r = static_cast<std::uint32_t>(from % 30);
+        for (std::uint32_t i = 0; i < 8; ++i) {
+            if (kWheel[i] == r) {
+                wheel = i;
+                return from;
+            }
+        }
+    }
+}
+
+}  // namespace
+
+std::uint64_t wholeSqrt(std::uint64_t n) {
+    auto r = static_cast<std::uint64_t>(std::sqrt(static_cast<double>(n)));
+    while (r * r > n) --r;
+    while ((r + 1) * (r + 1) <= n) ++r;
+    return r;
+}
+
+std::vector<std::uint32_t> sievingPrimes(std::uint32_t bound) {
+    std::vector<std::uint32_t> primes;
+    if (bound < 7) return primes;
+    // Index i stands for 2i + 1.
+    std::vector<std::uint8_t> composite(bound / 2 + 1, 0);
+    for (std::uint64_t i = 1; (2 * i + 1) * (2 * i + 1) <= bound; ++i) {
+        if (composite[i]) continue;
+        const std::uint64_t p = 2 * i + 1;
+        for (std::uint64_t j = p * p / 2; j < composite.size(); j += p) composite[j] = 1;
+    }
+    primes.reserve(bound < 100 ? 32 : static_cast<std::size_t>(1.3 * bound / std::log(bound)));
+    for (std::uint64_t i = 3; 2 * i + 1 <= bound; ++i)
+        if (!composite[i]) primes.push_back(static_cast<std::uint32_t>(2 * i + 1));
+    return primes;
+}
+
+WheelSieve::WheelSieve(std::int64_t firstTurn, std::int64_t limit) : turn_(firstTurn) {
+    const std::uint64_t root = limit > 0 ? wholeSqrt(static_cast<std::uint64_t>(limit)) : 0;
+    const std::vector<std::uint32_t> primes = sievingPrimes(static_cast<std::uint32_t>(root));
+    const auto start = static_cast<std::uint64_t>(turnStart(firstTurn));
+    constexpr std::uint32_t kSmallBound = 1u << 15;
+    large_.reserve(static_cast<std::size_t>(std::count_if(
+        primes.begin(), primes.end(), [](std::uint32_t p) { return p >= kSmallBound; })));
+    for (const std::uint32_t p : primes) {
+        // The first multiple to cross off: p * q with q prime to 30, q >= p and p * q >= start.
+        const std::uint64_t lowest = std::max<std::uint64_t>(p, (start + p - 1) / p);
+        std::uint32_t wheel = 0;
+        std::uint64_t q = nextWheelNumber(lowest, wheel);
+        if (p < kSmallBound) {
+            Small s{p, {}};
+            // Eight consecutive multipliers cover every bit once; each repeats every p bytes.
+            for (int k = 0; k < 8; ++k) {
+                const std::uint64_t m = p * q;
+                const std::uint64_t t = (m - 11) / 30;
+                const int bit = __builtin_ctz(kBitOf[(m - 11) % 30]);
+                s.next[bit] = t - static_cast<std::uint64_t>(firstTurn);
+                q += kWheelStep[wheel];
+                wheel = (wheel + 1) & 7;
+            }
+            small_.push_back(s);
+        } else {
+            large_.push_back(Large{p * q, p, wheel});
+        }
+    }
+}
+
+void WheelSieve::sieveNext(std::uint8_t* bytes, std::size_t turns) {
+    std::memset(bytes, 0, turns);
+    const std::uint64_t length = turns;
+    for (Small& s : small_) {
+        const std::uint64_t p = s.p;
+        for (int b = 0; b < 8; ++b) {
+            std::uint64_t j = s.next[b];
+            const auto mask = static_cast<std::uint8_t>(1u << b);
+            for (; j < length; j += p) bytes[j] |= mask;
+            s.next[b] = j - length;
+        }
+    }
+    const auto first = static_cast<std::uint64_t>(turn_);
+    const std::uint64_t end =
+        static_cast<std::uint64_t>(turnStart(turn_ + static_cast<std::int64_t>(turns)));
+    for (Large& l : large_) {
+        std::uint64_t m = l.multiple;
+        if (m >= end) continue;
+        std::uint32_t wheel = l.wheel;
+        const std::uint64_t p = l.p;
+        do {
+            const std::uint64_t shifted = m - 11;
+            bytes[shifted / 30 - first] |= kBitOf[shifted % 30];
+            m += p * kWheelStep[wheel];
+            wheel = (wheel + 1) & 7;
+        } while (m < end);
+        l.multiple = m;
+        l.wheel = wheel;
+    }
+    turn_ += static_cast<std::int64_t>(turns);
+}
+
+}  // namespace tarn
