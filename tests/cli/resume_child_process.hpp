@@ -2,6 +2,7 @@
 // at exit codes and texts, send it signals and kill it at any moment.
 #pragma once
 
+#include <fcntl.h>
 #include <signal.h>
 #include <spawn.h>
 #include <sys/wait.h>

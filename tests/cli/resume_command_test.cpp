@@ -1,6 +1,5 @@
 // tarn-cli resume as a user runs it: exit codes, the report on stdout, notes on stderr, and the
 // files it leaves.
-#include <fcntl.h>
 #include <gtest/gtest.h>
 
 #include <chrono>
