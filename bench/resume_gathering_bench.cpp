@@ -34,7 +34,8 @@ struct BenchFile {
             text += std::to_string(n) + "\r\n";
             lastPrime = n;
         }
-        if (::write(fd, text.data(), text.size()) != static_cast<ssize_t>(text.size())) std::abort();
+        if (::write(fd, text.data(), text.size()) != static_cast<ssize_t>(text.size()))
+            std::abort();
         ::close(fd);
         bytes = text.size();
     }

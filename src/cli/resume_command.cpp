@@ -11,8 +11,8 @@
 namespace tarn::cli {
 
 void registerResumeCommand(CLI::App& app, Context& ctx) {
-    auto* command = app.add_subcommand(
-        "resume", "Continue the stopped generation job recorded in primes.ini");
+    auto* command =
+        app.add_subcommand("resume", "Continue the stopped generation job recorded in primes.ini");
     command->callback([&ctx] {
         ResumeEvents events;
         events.onGathering = [] { std::cerr << kGatheringInfoLine << '\n'; };

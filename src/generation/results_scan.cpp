@@ -49,13 +49,12 @@ public:
         const bool enumerated = semicolon != std::string_view::npos;
         std::int64_t value = 0;
         std::int64_t serial = 0;
-        const bool readable =
-            enumerated ? parseDigits(record.substr(0, semicolon), serial) &&
-                             parseDigits(record.substr(semicolon + 1), value)
-                       : parseDigits(record, value);
+        const bool readable = enumerated ? parseDigits(record.substr(0, semicolon), serial) &&
+                                               parseDigits(record.substr(semicolon + 1), value)
+                                         : parseDigits(record, value);
         if (!readable)
-            return damaged("holds a record that is not a number at line " +
-                           std::to_string(number) + ": \"" + printable(record) + "\"");
+            return damaged("holds a record that is not a number at line " + std::to_string(number) +
+                           ": \"" + printable(record) + "\"");
         if (scan_.records > 0 && enumerated != scan_.enumerated)
             return damaged("mixes plain and enumerated records at line " + std::to_string(number));
         if (value > resumePoint_) return false;  // beyond the checkpoint: cut from here
@@ -137,9 +136,9 @@ ResultsScan::Outcome readLines(int fd, Scanner& scanner, ResultsScan& scan,
                 carry.clear();
                 carryOverlong = false;
             }
-            if (!go) return scan.outcome == ResultsScan::Outcome::Damaged
-                                ? ResultsScan::Outcome::Damaged
-                                : ResultsScan::Outcome::Sound;
+            if (!go)
+                return scan.outcome == ResultsScan::Outcome::Damaged ? ResultsScan::Outcome::Damaged
+                                                                     : ResultsScan::Outcome::Sound;
             p = eol + 1;
         }
         offset += static_cast<std::uint64_t>(got);
@@ -149,8 +148,7 @@ ResultsScan::Outcome readLines(int fd, Scanner& scanner, ResultsScan& scan,
 
 }  // namespace
 
-ResultsScan scanResults(const std::string& path, std::int64_t resumePoint,
-                        const StopSignal& stop) {
+ResultsScan scanResults(const std::string& path, std::int64_t resumePoint, const StopSignal& stop) {
     ResultsScan scan;
     const int fd = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
     if (fd < 0) {

@@ -11,8 +11,8 @@
 #include "core/entry.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/file_names.hpp"
-#include "generation/resume_texts.hpp"
 #include "generation/results_scan.hpp"
+#include "generation/resume_texts.hpp"
 
 namespace tarn {
 namespace {
@@ -21,6 +21,18 @@ ResumeResult refused(std::string message) {
     ResumeResult result;
     result.status = ResumeResult::Status::Refused;
     result.message = std::move(message);
+    return result;
+}
+
+// The files are as they were; the checkpoint still says where the job stands.
+ResumeResult stoppedWhileGathering(const std::string& resultsPath, std::int64_t resumePoint,
+                                   std::int64_t limit) {
+    ResumeResult result;
+    result.status = ResumeResult::Status::Stopped;
+    result.job.status = JobResult::Status::Stopped;
+    result.job.candidate = resumePoint;
+    result.job.limit = limit;
+    result.job.resultsPath = resultsPath;
     return result;
 }
 
@@ -50,18 +62,13 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
             return refused(unreadableResultsRefusal(resultsPath, scan.problem));
         case ResultsScan::Outcome::Damaged:
             return refused(damagedResultsRefusal(resultsPath, scan.problem));
-        case ResultsScan::Outcome::Stopped: {
-            ResumeResult result;
-            result.status = ResumeResult::Status::Stopped;
-            result.job.status = JobResult::Status::Stopped;
-            result.job.candidate = resumePoint;
-            result.job.limit = limit;
-            result.job.resultsPath = resultsPath;
-            return result;
-        }
+        case ResultsScan::Outcome::Stopped:
+            return stoppedWhileGathering(resultsPath, resumePoint, limit);
         case ResultsScan::Outcome::Sound:
             break;
     }
+    // The last block may have been read after the stop: leave before anything is written.
+    if (stop.requested()) return stoppedWhileGathering(resultsPath, resumePoint, limit);
 
     // Records past the checkpoint and a torn last line were written after the last checkpoint
     // of a killed job; the turns that wrote them run again.

@@ -27,8 +27,8 @@ std::string limitOutOfRangeRefusal(const std::string& path, std::int64_t limit) 
 }
 
 std::string unreadableResultsRefusal(const std::string& path, const std::string& reason) {
-    return "Impossible to resume: the results file " + path + " cannot be read (" + reason +
-           ")." + std::string(kNothingChanged);
+    return "Impossible to resume: the results file " + path + " cannot be read (" + reason + ")." +
+           std::string(kNothingChanged);
 }
 
 std::string damagedResultsRefusal(const std::string& path, const std::string& problem) {

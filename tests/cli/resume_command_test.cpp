@@ -23,7 +23,9 @@ struct CliFiles {
     TempFolder output;  // the child's captured output, kept apart
     std::string results() const { return folder.path() + "primes.txt"; }
     std::string checkpoint() const { return folder.path() + "primes.ini"; }
-    test::CliRun resume() { return test::runCli({"--folder", folder.path(), "resume"}, output.path()); }
+    test::CliRun resume() {
+        return test::runCli({"--folder", folder.path(), "resume"}, output.path());
+    }
 };
 
 TEST(ResumeCommand, CompletesAndPrintsTheReport) {

@@ -30,9 +30,9 @@ TEST(GapPrimality, AgreesWithASieveBelowTwoMillion) {
 
 TEST(GapPrimality, AgreesWithTrialDivisionAtTheTopOfTheRange) {
     // Strong pseudoprimes to small bases and squares of large primes trip weaker tests.
-    for (const std::int64_t n : {std::int64_t{3215031751}, std::int64_t{2152302898747},
-                                 std::int64_t{3474749660383}, std::int64_t{341550071728321},
-                                 std::int64_t{30370009} * 30370009})
+    for (const std::int64_t n :
+         {std::int64_t{3215031751}, std::int64_t{2152302898747}, std::int64_t{3474749660383},
+          std::int64_t{341550071728321}, std::int64_t{30370009} * 30370009})
         EXPECT_EQ(isPrimeByMillerRabin(n), primeByTrialDivision(n)) << n;
     int primes = 0;
     for (std::int64_t n = 922337203685277 - 300; n <= 922337203685277; ++n) {

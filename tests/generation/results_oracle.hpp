@@ -32,8 +32,7 @@ inline std::string oracleResults(std::int64_t upTo, bool enumerated) {
     return text;
 }
 
-inline std::string oracleCheckpoint(std::int64_t candidate, std::int64_t limit,
-                                    int interrupted) {
+inline std::string oracleCheckpoint(std::int64_t candidate, std::int64_t limit, int interrupted) {
     std::string line;
     for (const std::int64_t v : {candidate, limit, std::int64_t{interrupted}}) {
         if (v >= 0) line += ' ';

@@ -50,8 +50,7 @@ TEST(ResultsScan, FindsADamagedRecordOnABlockBoundary) {
     const std::int64_t line = std::count(text.begin(), text.begin() + start, '\n') + 1;
     const ResultsScan scan = scanText(text, 2999977);
     EXPECT_EQ(scan.outcome, Outcome::Damaged);
-    EXPECT_NE(scan.problem.find("not a number at line " + std::to_string(line)),
-              std::string::npos)
+    EXPECT_NE(scan.problem.find("not a number at line " + std::to_string(line)), std::string::npos)
         << scan.problem;
 }
 

@@ -235,10 +235,10 @@ TEST(ResumeJob, FilesThatCannotBeTrustedAreRefusedUnchanged) {
         EXPECT_EQ(result.status, ResumeResult::Status::Refused) << c.name;
         EXPECT_NE(result.message.find(c.expected), std::string::npos)
             << c.name << ": " << result.message;
-        const std::string named = c.records == good && c.checkpoint != goodLine
-                                      ? files.checkpoint()
-                                      : files.results();
-        EXPECT_NE(result.message.find(named), std::string::npos) << c.name << ": " << result.message;
+        const std::string named =
+            c.records == good && c.checkpoint != goodLine ? files.checkpoint() : files.results();
+        EXPECT_NE(result.message.find(named), std::string::npos)
+            << c.name << ": " << result.message;
         EXPECT_EQ(recorded.continuing, 0) << c.name;
         EXPECT_EQ(readFile(files.results()), c.records == "<none>" ? "" : c.records) << c.name;
         EXPECT_EQ(readFile(files.checkpoint()), c.checkpoint) << c.name;
@@ -273,7 +273,8 @@ TEST(ResumeJob, RepeatedStopsAndResumesGiveTheUninterruptedFile) {
             std::atomic<bool> done{false};
             const std::int64_t target = cycle * 30000;
             std::thread watcher([&] {
-                while (!done.load() && progress.candidate.load() < target) std::this_thread::yield();
+                while (!done.load() && progress.candidate.load() < target)
+                    std::this_thread::yield();
                 stop.request();
             });
             Recorded recorded;
