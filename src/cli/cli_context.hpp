@@ -25,6 +25,7 @@ struct Context {
 void registerNumberCommands(CLI::App& app, Context& ctx);
 void registerGenerationCommands(CLI::App& app, Context& ctx);
 void registerSplitCommand(CLI::App& app, Context& ctx);
+void registerResumeCommand(CLI::App& app, Context& ctx);
 
 // Raises `stop` on SIGINT and SIGTERM.
 void installInterruptHandler(StopSignal& stop);

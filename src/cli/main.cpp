@@ -27,6 +27,7 @@ int main(int argc, char** argv) {
     tarn::cli::registerNumberCommands(app, ctx);
     tarn::cli::registerGenerationCommands(app, ctx);
     tarn::cli::registerSplitCommand(app, ctx);
+    tarn::cli::registerResumeCommand(app, ctx);
 
     tarn::cli::installInterruptHandler(stop);
     try {

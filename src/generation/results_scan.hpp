@@ -1,0 +1,33 @@
+// Reads a results file back before a resume: counts its records, learns their form, and checks
+// everything the resume relies on, without trusting the file. The scan stops at the first record
+// beyond the checkpoint's candidate; that record and everything after it, like a torn last line
+// left by a killed job, are to be cut off and generated again.
+// It reads 1 MiB blocks and finds line ends with memchr, so it runs at the speed of the disk.
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+#include "core/stop_signal.hpp"
+
+namespace tarn {
+
+struct ResultsScan {
+    enum class Outcome { Sound, Stopped, Unreadable, Damaged };
+    Outcome outcome = Outcome::Unreadable;
+    // Unreadable: the system's reason; Damaged: what is wrong, completing
+    // "the results file <path> ..." (for instance "holds no records").
+    std::string problem;
+    std::int64_t records = 0;    // complete records at or below the candidate
+    std::int64_t lastPrime = 0;  // the last of them
+    bool enumerated = false;
+    std::uint64_t keptBytes = 0;  // where those records end
+    std::uint64_t fileBytes = 0;
+};
+
+// Checks that the records are numbers in one form, increasing, serially numbered from 1 when
+// enumerated, start with the seeds 2, 3, 5, 7, and end with the largest prime at or below
+// resumePoint. Looks at `stop` once per block.
+ResultsScan scanResults(const std::string& path, std::int64_t resumePoint, const StopSignal& stop);
+
+}  // namespace tarn

@@ -1,0 +1,93 @@
+// Kill tests: tarn-cli generate and resume are killed with SIGKILL at random moments, then
+// resumed until the job completes; the results file must be byte for byte that of one
+// uninterrupted run. A kill before the first periodic checkpoint leaves nothing to resume, and
+// then the job is simply started again.
+#include <gtest/gtest.h>
+
+#include <chrono>
+#include <random>
+#include <thread>
+
+#include "../generation/results_oracle.hpp"
+#include "generation/checkpoint_file.hpp"
+#include "resume_child_process.hpp"
+
+namespace tarn {
+namespace {
+
+using test::CliChild;
+using test::readFile;
+using test::TempFolder;
+
+// A short account of where two files part, instead of megabytes of diff.
+std::string firstDifference(const std::string& got, const std::string& want) {
+    std::size_t at = 0;
+    while (at < got.size() && at < want.size() && got[at] == want[at]) ++at;
+    if (at == got.size() && at == want.size()) return "";
+    const std::size_t from = at < 40 ? 0 : at - 40;
+    return "sizes " + std::to_string(got.size()) + " and " + std::to_string(want.size()) +
+           ", first difference at byte " + std::to_string(at) + ": got \"" + got.substr(from, 80) +
+           "\", want \"" + want.substr(from, 80) + "\"";
+}
+
+bool generateCommandExists() {
+    TempFolder output;
+    const test::CliRun run = test::runCli({"generate", "--help"}, output.path());
+    return run.code == 0 && run.out.find("tarn-cli generate") != std::string::npos;
+}
+
+TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
+    if (!generateCommandExists())
+        GTEST_SKIP() << "needs the generation engine and the `tarn-cli generate` command";
+    const std::string limit = "3000000";
+
+    TempFolder reference, output;
+    ASSERT_EQ(test::runCli({"--folder", reference.path(), "generate", limit}, output.path()).code,
+              0);
+    const std::string expected = readFile(reference.path() + "primes.txt");
+    const std::string expectedCheckpoint = readFile(reference.path() + "primes.ini");
+    ASSERT_EQ(expected, test::oracleResults(3000000, false));
+
+    const unsigned seed = std::random_device{}();
+    std::mt19937 random(seed);
+    std::uniform_int_distribution<int> killDelay(20, 300);
+    int resumes = 0, restarts = 0;
+    for (int run = 0; run < 5; ++run) {
+        TempFolder folder;
+        bool completed = false;
+        std::string history;  // the commands of this run and how each ended
+        for (int attempt = 0; attempt < 30 && !completed; ++attempt) {
+            const auto checkpoint = readCheckpoint(folder.path() + "primes.ini");
+            const bool resume = checkpoint && checkpoint->interrupted == 1;
+            (resume ? resumes : restarts) += attempt > 0;
+            const std::vector<std::string> args =
+                resume ? std::vector<std::string>{"--folder", folder.path(), "resume"}
+                       : std::vector<std::string>{"--folder", folder.path(), "generate", limit};
+            CliChild child(args, output.path());
+            ASSERT_TRUE(child.started());
+            const bool kill = attempt < 4;  // then let it run to its end
+            if (kill) {
+                std::this_thread::sleep_for(std::chrono::milliseconds(killDelay(random)));
+                child.signal(SIGKILL);
+            }
+            const int code = child.wait();
+            history += std::string(resume ? " resume:" : " generate:") + std::to_string(code);
+            if (code == 0) {
+                completed = true;
+            } else {
+                ASSERT_TRUE(kill && code == 128 + SIGKILL)
+                    << "seed " << seed << ", run " << run << ", attempt " << attempt << ": "
+                    << history << ": " << child.err();
+            }
+        }
+        ASSERT_TRUE(completed) << "seed " << seed << history;
+        ASSERT_EQ(firstDifference(readFile(folder.path() + "primes.txt"), expected), "")
+            << "seed " << seed << ", run " << run << history;
+        EXPECT_EQ(readFile(folder.path() + "primes.ini"), expectedCheckpoint);
+    }
+    RecordProperty("resumes", resumes);
+    RecordProperty("restarts", restarts);
+}
+
+}  // namespace
+}  // namespace tarn
