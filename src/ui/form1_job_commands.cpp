@@ -1,13 +1,146 @@
+// Generate, Resume and start-up. A job runs on a worker; the window shows its progress a few
+// times a second and reports its outcome once the worker has finished with the files.
+#include <QProgressBar>
+
+#include "core/command_texts.hpp"
+#include "core/entry.hpp"
+#include "generation/job_texts.hpp"
+#include "generation/resume_job.hpp"
+#include "generation/resume_texts.hpp"
+#include "generation/startup_check.hpp"
 #include "ui/form1.hpp"
+#include "ui/message_box.hpp"
+#include "ui/worker.hpp"
+#include "ui_form1.h"
 
 namespace tarn::ui {
+namespace {
 
-void Form1::Form_Load() {}
-void Form1::Command1_Click() {}
-void Form1::Command3_Click() {}
-void Form1::startJobDisplay(std::int64_t, std::int64_t) {}
-void Form1::refreshJobDisplay() {}
-void Form1::finishJob(const JobResult&) {}
-bool Form1::refuseWhileJobRuns() { return false; }
+constexpr const char* kJobBusy =
+    "A calculation is already running. Stop it with \"Cancel all calculations\" first.";
+// The bar's own range is an int; the job's range is scaled onto it.
+constexpr int kBarSteps = 1'000'000;
+
+}  // namespace
+
+void Form1::Form_Load() {
+    closingRequested_ = false;
+    if (checkCheckpointAtStartup(folder_).showInterruptedPrompt)
+        messages_.show(std::string(kInterruptedPrompt), std::string(kInfoTitle));
+}
+
+bool Form1::refuseWhileJobRuns() {
+    if (!jobRunning_) return false;
+    messages_.show(kJobBusy, std::string(kInfoTitle));
+    return true;
+}
+
+void Form1::Command1_Click() {
+    if (refuseWhileJobRuns()) return;
+    const bool enumerated = ui_->Check1->isChecked();
+    const EntryResult entry = ReadNumberEntry(ui_->Text1->text().toStdString(), decimalSeparator());
+    if (!entry.accepted()) {
+        messages_.show(entry.message, std::string(kInfoTitle));
+        return;
+    }
+    const std::int64_t limit = entry.number->whole();
+    if (const auto refusal = checkGenerationMinimum(limit)) {
+        messages_.show(*refusal, std::string(kInfoTitle));
+        return;
+    }
+    jobStop_.clear();
+    jobRunning_ = true;
+    jobProgress_.candidate = 0;
+    startJobDisplay(limit, 0);
+    const JobSpec spec{folder_, limit, enumerated};
+    runOnWorker(
+        this, [this, spec] { return runJob(spec, jobStop_, &jobProgress_); },
+        [this](const JobResult& result) { finishJob(result); });
+}
+
+void Form1::Command3_Click() {
+    if (refuseWhileJobRuns()) return;
+    jobStop_.clear();
+    jobRunning_ = true;
+    ResumeEvents events;
+    events.onGathering = [this] {
+        QMetaObject::invokeMethod(this, [this] {
+            ui_->Label5->setText(QString::fromUtf8(kGatheringInfoLine.data()));
+        });
+    };
+    events.onContinuing = [this](const ResumeStart& start) {
+        QMetaObject::invokeMethod(this, [this, start] {
+            ui_->Label5->setText(QString::fromUtf8(kDoingResumeInfoLine.data()));
+            ui_->Text1->setText(QString::number(start.limit));
+            if (start.enumerated) ui_->Check1->setChecked(true);
+            startJobDisplay(start.limit, start.resumePoint);
+        });
+    };
+    jobProgress_.candidate = 0;
+    runOnWorker(
+        this, [this, events] { return runResume(folder_, jobStop_, &jobProgress_, events); },
+        [this](const ResumeResult& result) {
+            switch (result.status) {
+                case ResumeResult::Status::NothingToResume:
+                    jobRunning_ = false;
+                    Q_EMIT jobFinished();
+                    if (closingRequested_) close();
+                    return;
+                case ResumeResult::Status::Refused:
+                    jobRunning_ = false;
+                    if (!closingRequested_)
+                        messages_.show(result.message, std::string(kInfoTitle));
+                    Q_EMIT jobFinished();
+                    if (closingRequested_) close();
+                    return;
+                default:
+                    finishJob(result.job);
+            }
+        });
+}
+
+void Form1::startJobDisplay(std::int64_t limit, std::int64_t position) {
+    jobLimit_ = limit;
+    jobStart_ = std::chrono::steady_clock::now();
+    jobProgress_.candidate = position;
+    ui_->ProgressBar1->setRange(0, kBarSteps);
+    refreshJobDisplay();
+    progressTimer_.start();
+}
+
+void Form1::refreshJobDisplay() {
+    const std::int64_t candidate =
+        std::clamp<std::int64_t>(jobProgress_.candidate.load(), 0, std::max<std::int64_t>(jobLimit_, 1));
+    const auto position = static_cast<int>(static_cast<long double>(candidate) * kBarSteps /
+                                           std::max<std::int64_t>(jobLimit_, 1));
+    ui_->ProgressBar1->setValue(std::clamp(position, 0, kBarSteps));
+    const auto elapsed = std::chrono::duration_cast<std::chrono::seconds>(
+        std::chrono::steady_clock::now() - jobStart_);
+    ui_->Label6->setText(QString::fromStdString(elapsedTimeText(elapsed)));
+}
+
+void Form1::finishJob(const JobResult& result) {
+    progressTimer_.stop();
+    jobRunning_ = false;
+    refreshJobDisplay();
+    if (!closingRequested_) {
+        switch (result.status) {
+            case JobResult::Status::Failed:
+                messages_.show(result.error, std::string(kInfoTitle));
+                break;
+            case JobResult::Status::Stopped:
+                messages_.show(std::string(kAllStoppedMessage), std::string(kCommandTitle));
+                break;
+            case JobResult::Status::Completed:
+                ui_->ProgressBar1->setValue(kBarSteps);
+                messages_.show(completionReport(result), std::string(kInfoTitle));
+                ui_->Label5->setText(QString::fromStdString(completionInfoLine(result)));
+                OpenResultsFile(OpenMode::AfterJob, result.resultsPath);
+                break;
+        }
+    }
+    Q_EMIT jobFinished();
+    if (closingRequested_) close();
+}
 
 }  // namespace tarn::ui
