@@ -4,10 +4,12 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
-#include <memory>
 #include <string_view>
 #include <system_error>
 #include <vector>
+
+#include <fcntl.h>
+#include <unistd.h>
 
 #include "core/app_folder.hpp"
 #include "core/number.hpp"
@@ -84,8 +86,14 @@ private:
     std::size_t used_ = 0;
 };
 
-struct FileCloser {
-    void operator()(std::FILE* f) const { std::fclose(f); }
+struct InputFile {
+    explicit InputFile(int descriptor) : fd(descriptor) {}
+    ~InputFile() {
+        if (fd >= 0) ::close(fd);
+    }
+    InputFile(const InputFile&) = delete;
+    InputFile& operator=(const InputFile&) = delete;
+    int fd;
 };
 
 // Line ends in [begin, end), and how many of them lack the CR before them. Written as plain
@@ -225,15 +233,14 @@ Splitter::Step Splitter::copyLastFragment(const char* data, std::size_t count) {
 
 SplitResult Splitter::run(const std::string& resultsPath) {
     errno = 0;
-    std::unique_ptr<std::FILE, FileCloser> in(std::fopen(resultsPath.c_str(), "rb"));
-    if (!in) {
+    const InputFile in(::open(resultsPath.c_str(), O_RDONLY | O_CLOEXEC));
+    if (in.fd < 0) {
         const int err = errno;
         failure_ = err == ENOENT ? "The results file " + resultsPath + " was not found."
                                  : "The results file " + resultsPath +
                                        " cannot be read: " + systemReason(err) + ".";
         return {SplitStatus::Failed, 0, failure_};
     }
-    std::setvbuf(in.get(), nullptr, _IONBF, 0);
     if (openNext() != Step::Go) return finish(SplitStatus::Failed);
 
     const std::size_t capacity = std::max<std::size_t>(options_.blockSize, 2);
@@ -243,14 +250,17 @@ SplitResult Splitter::run(const std::string& resultsPath) {
     bool partial = false;      // that record's beginning already went out (longer than a block)
     for (;;) {
         if (!partial && stopHere()) return finish(SplitStatus::Stopped);
-        errno = 0;
-        const std::size_t got = std::fread(data + carry, 1, capacity - carry, in.get());
+        // One plain read: from a pipe it answers with what is there, so a stop raised while
+        // the split waits for more is seen as soon as the read returns.
+        const ssize_t got = ::read(in.fd, data + carry, capacity - carry);
+        if (got < 0) {
+            // A signal (the command line's Ctrl-C) broke the wait: look at the stop again.
+            if (errno == EINTR) continue;
+            failure_ = "The results file " + resultsPath +
+                       " cannot be read: " + systemReason(errno) + ".";
+            return finish(SplitStatus::Failed);
+        }
         if (got == 0) {
-            if (std::ferror(in.get())) {
-                failure_ = "The results file " + resultsPath +
-                           " cannot be read: " + systemReason(errno) + ".";
-                return finish(SplitStatus::Failed);
-            }
             if (carry > 0 || partial) {
                 const Step s = copyLastFragment(data, carry);
                 if (s != Step::Go)
@@ -258,7 +268,7 @@ SplitResult Splitter::run(const std::string& resultsPath) {
             }
             return finish(SplitStatus::Completed);
         }
-        const std::size_t length = carry + got;
+        const std::size_t length = carry + static_cast<std::size_t>(got);
         const std::size_t lastLf = std::string_view(data, length).rfind('\n');
         if (lastLf == std::string_view::npos) {
             if (length < capacity) {
