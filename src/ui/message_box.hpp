@@ -4,6 +4,8 @@
 
 #include <string>
 
+class QWidget;
+
 namespace tarn::ui {
 
 class MessageBox {
@@ -20,7 +22,7 @@ public:
 // Real modal boxes over the given parent window (may be null).
 class QtMessageBox final : public MessageBox {
 public:
-    explicit QtMessageBox(class QWidget* parent = nullptr) : parent_(parent) {}
+    explicit QtMessageBox(QWidget* parent = nullptr) : parent_(parent) {}
     void setParent(QWidget* parent) { parent_ = parent; }
     Answer show(const std::string& text, const std::string& title, Buttons buttons) override;
 
