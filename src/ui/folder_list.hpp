@@ -21,6 +21,10 @@ public:
 Q_SIGNALS:
     void changed();
 
+protected:
+    // The list reads as open folders over closed ones; no expand or collapse marks.
+    void drawBranches(QPainter*, const QRect&, const QModelIndex&) const override {}
+
 private:
     void rebuild();
 
