@@ -1,5 +1,8 @@
 #include "tools/split_results.hpp"
 
+#include <fcntl.h>
+#include <unistd.h>
+
 #include <algorithm>
 #include <cerrno>
 #include <cstdio>
@@ -7,9 +10,6 @@
 #include <string_view>
 #include <system_error>
 #include <vector>
-
-#include <fcntl.h>
-#include <unistd.h>
 
 #include "core/app_folder.hpp"
 #include "core/number.hpp"
@@ -19,9 +19,7 @@ namespace {
 
 constexpr std::size_t kStagingSize = 64 * 1024;
 
-std::string systemReason(int err) {
-    return std::generic_category().message(err != 0 ? err : EIO);
-}
+std::string systemReason(int err) { return std::generic_category().message(err != 0 ? err : EIO); }
 
 // One output file. Runs of whole records go to the system as they stand; the small pieces
 // that mend bare line ends are gathered first so that they do not cost a write each.
@@ -246,8 +244,8 @@ SplitResult Splitter::run(const std::string& resultsPath) {
     const std::size_t capacity = std::max<std::size_t>(options_.blockSize, 2);
     std::vector<char> buffer(capacity);
     char* const data = buffer.data();
-    std::size_t carry = 0;     // bytes of a record whose line end has not been read yet
-    bool partial = false;      // that record's beginning already went out (longer than a block)
+    std::size_t carry = 0;  // bytes of a record whose line end has not been read yet
+    bool partial = false;   // that record's beginning already went out (longer than a block)
     for (;;) {
         if (!partial && stopHere()) return finish(SplitStatus::Stopped);
         // One plain read: from a pipe it answers with what is there, so a stop raised while
@@ -256,8 +254,8 @@ SplitResult Splitter::run(const std::string& resultsPath) {
         if (got < 0) {
             // A signal (the command line's Ctrl-C) broke the wait: look at the stop again.
             if (errno == EINTR) continue;
-            failure_ = "The results file " + resultsPath +
-                       " cannot be read: " + systemReason(errno) + ".";
+            failure_ =
+                "The results file " + resultsPath + " cannot be read: " + systemReason(errno) + ".";
             return finish(SplitStatus::Failed);
         }
         if (got == 0) {

@@ -16,7 +16,7 @@ namespace {
 char decimalSeparator() {
     const QString point = QLocale().decimalPoint();
     return point.size() == 1 && point[0].unicode() < 128 ? static_cast<char>(point[0].unicode())
-                                                          : '.';
+                                                         : '.';
 }
 
 // As close to the classic 8-point dialog font as the platform offers.

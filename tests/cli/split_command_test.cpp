@@ -1,16 +1,15 @@
 // tarn-cli split, run as the real program: messages, streams and exit codes.
 #include <gtest/gtest.h>
+#include <signal.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
 
 #include <array>
 #include <csignal>
 #include <cstdio>
 #include <filesystem>
 #include <string>
-
-#include <signal.h>
-#include <sys/stat.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
 #include "support/temp_folder.hpp"
 
@@ -28,8 +27,8 @@ struct CliRun {
 CliRun runCli(const std::string& arguments, const TempFolder& scratch) {
     const std::string outPath = scratch.path() + "stdout.txt";
     const std::string errPath = scratch.path() + "stderr.txt";
-    const std::string command = std::string(TARN_CLI_PATH) + " " + arguments + " >" + outPath +
-                                " 2>" + errPath;
+    const std::string command =
+        std::string(TARN_CLI_PATH) + " " + arguments + " >" + outPath + " 2>" + errPath;
     const int status = std::system(command.c_str());
     return {WEXITSTATUS(status), readFile(outPath), readFile(errPath)};
 }
@@ -63,8 +62,7 @@ TEST_F(SplitCommand, SplitsAndPrintsTheFinalMessage) {
 
 TEST_F(SplitCommand, RefusesCountsWithTheWindowsMessages) {
     writeFile(data.path() + "primes.txt", records(10));
-    for (const auto& [count, message] :
-         std::array<std::pair<const char*, const char*>, 3>{{
+    for (const auto& [count, message] : std::array<std::pair<const char*, const char*>, 3>{{
              {"999.9", "Minimum value is 1000 records.\n"},
              {"abc", "Invalid entry.\n"},
              {"1e300", "Value out of range. Value must be between 1000 and 922 337 203 685 477.\n"},
@@ -83,12 +81,11 @@ TEST_F(SplitCommand, ReportsFileFailuresWithExitCodeOne) {
     EXPECT_EQ(missing.err, "The results file " + data.path() + "primes.txt was not found.\n");
 
     writeFile(data.path() + "primes.txt", records(10));
-    const CliRun unwritable = runCli("--folder " + data.path() + " split --records 1000 --into " +
-                                      data.path() + "primes.txt",
-                                  scratch);
+    const CliRun unwritable = runCli(
+        "--folder " + data.path() + " split --records 1000 --into " + data.path() + "primes.txt",
+        scratch);
     EXPECT_EQ(unwritable.exitCode, 1);
-    EXPECT_NE(unwritable.err.find("primes.txt/primes1.txt"), std::string::npos)
-        << unwritable.err;
+    EXPECT_NE(unwritable.err.find("primes.txt/primes1.txt"), std::string::npos) << unwritable.err;
 }
 
 TEST_F(SplitCommand, CtrlCStopsBetweenRecordsWithExitCodeThree) {
@@ -102,8 +99,8 @@ TEST_F(SplitCommand, CtrlCStopsBetweenRecordsWithExitCodeThree) {
     if (pid == 0) {
         std::freopen(outPath.c_str(), "w", stdout);
         const std::string intoFolder = into.path();
-        execl(TARN_CLI_PATH, TARN_CLI_PATH, "--folder", data.path().c_str(), "split",
-              "--records", "1000", "--into", intoFolder.c_str(), static_cast<char*>(nullptr));
+        execl(TARN_CLI_PATH, TARN_CLI_PATH, "--folder", data.path().c_str(), "split", "--records",
+              "1000", "--into", intoFolder.c_str(), static_cast<char*>(nullptr));
         _exit(127);
     }
     std::string sent = records(1500);

@@ -1,7 +1,7 @@
 // The count entry of the split: its floor, its truncation and its refusals.
-#include <gtest/gtest.h>
-
 #include "tools/split_entry.hpp"
+
+#include <gtest/gtest.h>
 
 using namespace tarn;
 

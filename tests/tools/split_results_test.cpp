@@ -1,5 +1,7 @@
 // The split of the results file: file sizes and names, byte-for-byte copies against a naive
 // line-by-line oracle, stop points, and the failures it must report.
+#include "tools/split_results.hpp"
+
 #include <gtest/gtest.h>
 
 #include <filesystem>
@@ -7,7 +9,6 @@
 #include <vector>
 
 #include "support/temp_folder.hpp"
-#include "tools/split_results.hpp"
 
 using namespace tarn;
 using tarn::test::readFile;
@@ -51,8 +52,8 @@ std::vector<std::string> naiveSplit(const std::string& input, std::size_t perFil
     std::size_t start = 0;
     while (start < input.size()) {
         std::size_t lf = input.find('\n', start);
-        std::string line = input.substr(start, lf == std::string::npos ? std::string::npos
-                                                                        : lf - start);
+        std::string line =
+            input.substr(start, lf == std::string::npos ? std::string::npos : lf - start);
         if (!line.empty() && line.back() == '\r') line.pop_back();
         lines.push_back(line + "\r\n");
         if (lf == std::string::npos) break;

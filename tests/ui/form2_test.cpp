@@ -1,6 +1,9 @@
 // The split window over the recording fakes: its built form, the refusals, a split on the
 // worker thread, and a split stopped by "Cancel" or by the title bar.
+#include "ui/form2.hpp"
+
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <QApplication>
 #include <QDir>
@@ -17,14 +20,11 @@
 #include <filesystem>
 #include <memory>
 
-#include <sys/stat.h>
-
 #include "support/temp_folder.hpp"
 #include "tools/split_entry.hpp"
 #include "tools/split_results.hpp"
 #include "ui/fakes.hpp"
 #include "ui/folder_list.hpp"
-#include "ui/form2.hpp"
 
 using namespace tarn;
 using tarn::test::FakeMessageBox;
@@ -63,7 +63,9 @@ struct Form2Test : ::testing::Test {
         return w;
     }
     QString command2() const { return child<QPushButton>("Command2")->text(); }
-    std::string outFile(int n) const { return documents.path() + "primes" + std::to_string(n) + ".txt"; }
+    std::string outFile(int n) const {
+        return documents.path() + "primes" + std::to_string(n) + ".txt";
+    }
 
     void split(const QString& count) {
         child<QLineEdit>("Text1")->setText(count);
