@@ -1,9 +1,47 @@
+// tarn-cli split: the split of the results file from the command line, with the window's
+// rules and texts. The count goes through the same entry as the window's box.
 #include <CLI/CLI.hpp>
+#include <iostream>
 
 #include "cli/cli_context.hpp"
+#include "generation/file_names.hpp"
+#include "tools/split_entry.hpp"
+#include "tools/split_results.hpp"
 
 namespace tarn::cli {
+namespace {
 
-void registerSplitCommand(CLI::App&, Context&) {}
+struct SplitArguments {
+    std::string records;
+    std::string into;
+};
+
+int runSplit(const SplitArguments& args, Context& ctx) {
+    const EntryResult count = parseRecordsPerFile(args.records);
+    if (!count.accepted()) {
+        std::cerr << count.message << '\n';
+        return kRefused;
+    }
+    const SplitResult r = splitResultsFile(
+        ctx.folder + kResultsFileName, splitNamePrefix(args.into), count.number->whole(), ctx.stop);
+    if (r.status == SplitStatus::Failed) {
+        std::cerr << r.message << '\n';
+        return kIoFailure;
+    }
+    std::cout << splitDoneMessage(r.files) << '\n';
+    return r.status == SplitStatus::Stopped ? kStopped : kOk;
+}
+
+}  // namespace
+
+void registerSplitCommand(CLI::App& app, Context& ctx) {
+    auto args = std::make_shared<SplitArguments>();
+    CLI::App* split = app.add_subcommand(
+        "split", "Copy the records of primes.txt into primes1.txt, primes2.txt ... in a folder");
+    split->add_option("--records", args->records, "Records in each file (at least 1000)")
+        ->required();
+    split->add_option("--into", args->into, "Folder that receives the files")->required();
+    split->callback([args, &ctx] { ctx.exitCode = runSplit(*args, ctx); });
+}
 
 }  // namespace tarn::cli

@@ -1,0 +1,51 @@
+// Splits the results file into primes1.txt, primes2.txt ... of a fixed number of records each.
+// The copy streams the file through one large buffer: it counts line ends with a vectorised
+// pass, finds a file's last record with memchr only where a file ends, and hands whole runs
+// of records to the system in single writes, so memory stays constant whatever the file size.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <functional>
+#include <string>
+
+#include "core/stop_signal.hpp"
+
+namespace tarn {
+
+inline constexpr std::size_t kSplitBlockSize = std::size_t{1} << 20;
+
+// The folder text as shown to the user, a separator and "primes", joined as they stand:
+// a root that already ends in the separator gives a doubled one ("/" gives "//primes").
+std::string splitNamePrefix(const std::string& folderText);
+// The prefix, the file's number in plain digits and ".txt".
+std::string splitFileName(const std::string& namePrefix, std::int64_t fileNumber);
+
+enum class SplitStatus { Completed, Stopped, Failed };
+
+struct SplitResult {
+    SplitStatus status = SplitStatus::Completed;
+    std::int64_t files = 0;  // output files opened, the first one always counting
+    std::string message;     // for Failed: the file and the system's reason
+};
+
+struct SplitOptions {
+    std::size_t blockSize = kSplitBlockSize;  // bytes read at once; small values only in tests
+    // Called at every point where the split looks at the stop signal, with the number of
+    // records copied so far; lets a caller show progress or raise the stop at an exact record.
+    std::function<void(std::int64_t)> onCheckpoint;
+};
+
+// Copies every record of resultsPath unchanged, each line ended by CR LF, into files named
+// by splitFileName(namePrefix, n). A new file is opened only when a record is there for it,
+// so an evenly divided count leaves no empty last file; an empty results file gives one empty
+// first file. The stop is looked at between records only (at block and file boundaries), so
+// a stopped split leaves complete records, the last file holding those it had received.
+SplitResult splitResultsFile(const std::string& resultsPath, const std::string& namePrefix,
+                             std::int64_t recordsPerFile, const StopSignal& stop,
+                             const SplitOptions& options = {});
+
+// "Done!!!", the signed text of the file count and " files were created.".
+std::string splitDoneMessage(std::int64_t files);
+
+}  // namespace tarn
