@@ -49,7 +49,7 @@ Form1::Form1(MessageBox& messages, Shell& shell, std::string folder, QWidget* pa
     connect(&progressTimer_, &QTimer::timeout, this, &Form1::refreshJobDisplay);
 }
 
-Form1::~Form1() = default;
+Form1::~Form1() { delete splitWindow_; }
 
 char Form1::decimalSeparator() const {
     const QString point = QLocale().decimalPoint();
