@@ -3,8 +3,11 @@
 // progress notes, refusals and the stop notice go to stderr.
 #include <CLI/CLI.hpp>
 #include <iostream>
+#include <memory>
+#include <optional>
 
 #include "cli/cli_context.hpp"
+#include "cli/job_report.hpp"
 #include "generation/resume_job.hpp"
 #include "generation/resume_texts.hpp"
 
@@ -13,11 +16,19 @@ namespace tarn::cli {
 void registerResumeCommand(CLI::App& app, Context& ctx) {
     auto* command =
         app.add_subcommand("resume", "Continue the stopped generation job recorded in primes.ini");
-    command->callback([&ctx] {
+    auto hooks = std::make_shared<JobHooks>();
+    addCheckpointIntervalOption(*command, *hooks);
+    command->callback([&ctx, hooks] {
+        JobProgress progress;
+        std::optional<ProgressLine> line;
         ResumeEvents events;
         events.onGathering = [] { std::cerr << kGatheringInfoLine << '\n'; };
-        events.onContinuing = [](const ResumeStart&) { std::cerr << kDoingResumeInfoLine << '\n'; };
-        const ResumeResult result = runResume(ctx.folder, ctx.stop, nullptr, events);
+        events.onContinuing = [&](const ResumeStart& start) {
+            std::cerr << kDoingResumeInfoLine << '\n';
+            line.emplace(progress, start.resumePoint, start.limit);
+        };
+        const ResumeResult result = runResume(ctx.folder, ctx.stop, &progress, events, *hooks);
+        line.reset();
         switch (result.status) {
             case ResumeResult::Status::NothingToResume:
                 std::cerr << kNothingToResumeNote << '\n';
@@ -28,12 +39,8 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
                 ctx.exitCode = kRefused;
                 break;
             case ResumeResult::Status::Completed:
-                std::cout << completionReport(result.job) << '\n';
-                ctx.exitCode = kOk;
-                break;
             case ResumeResult::Status::Stopped:
-                std::cerr << kResumeStoppedNotice << '\n';
-                ctx.exitCode = kStopped;
+                ctx.exitCode = reportJob(result.job);
                 break;
             case ResumeResult::Status::Failed:
                 std::cerr << result.message << '\n';

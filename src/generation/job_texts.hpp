@@ -12,7 +12,6 @@ namespace tarn {
 
 inline constexpr std::int64_t kGenerationMinimum = 100;
 inline constexpr std::string_view kMinimumMessage = "Minimum value is 100";
-inline constexpr std::string_view kStoppedMessage = "All calculations were stopped!";
 
 // "Minimum value is 100" for a whole number below 100, nothing otherwise.
 std::optional<std::string> checkGenerationMinimum(std::int64_t whole);

@@ -39,7 +39,7 @@ ResumeResult stoppedWhileGathering(const std::string& resultsPath, std::int64_t 
 }  // namespace
 
 ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                       const ResumeEvents& events) {
+                       const ResumeEvents& events, const JobHooks& hooks) {
     const std::string checkpointPath = folder + kCheckpointFileName;
     const std::string resultsPath = folder + kResultsFileName;
 
@@ -95,7 +95,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
     spec.primeCountBefore = scan.records;
 
     ResumeResult result;
-    result.job = runJob(spec, stop, progress);
+    result.job = runJob(spec, stop, progress, hooks);
     switch (result.job.status) {
         case JobResult::Status::Completed:
             result.status = ResumeResult::Status::Completed;

@@ -36,6 +36,6 @@ struct ResumeResult {
 // Called on a worker thread; the events are called from that thread. The caller clears `stop`
 // before; a stop while the results file is read ends with Stopped and changes no file.
 ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                       const ResumeEvents& events);
+                       const ResumeEvents& events, const JobHooks& hooks = {});
 
 }  // namespace tarn

@@ -25,7 +25,6 @@ inline constexpr std::string_view kDoingResumeInfoLine = "INFO: Doing resume..."
 
 // Command-line notes.
 inline constexpr std::string_view kNothingToResumeNote = "Nothing to resume.";
-inline constexpr std::string_view kResumeStoppedNotice = "All calculations were stopped!";
 
 // Refusals of files that cannot be continued. Every one ends by saying that nothing changed.
 std::string unreadableCheckpointRefusal(const std::string& path);

@@ -93,8 +93,15 @@ void Form1::Command3_Click() {
                     Q_EMIT jobFinished();
                     if (closingRequested_) close();
                     return;
-                default:
-                    finishJob(result.job);
+                default: {
+                    // A resume can fail before its job starts (cutting the file back).
+                    JobResult job = result.job;
+                    if (result.status == ResumeResult::Status::Failed) {
+                        job.status = JobResult::Status::Failed;
+                        job.error = result.message;
+                    }
+                    finishJob(job);
+                }
             }
         });
 }

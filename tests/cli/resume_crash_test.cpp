@@ -4,11 +4,12 @@
 // then the job is simply started again.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 #include <chrono>
 #include <random>
 #include <thread>
 
-#include "../generation/results_oracle.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "resume_child_process.hpp"
 
@@ -39,18 +40,21 @@ bool generateCommandExists() {
 TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
     if (!generateCommandExists())
         GTEST_SKIP() << "needs the generation engine and the `tarn-cli generate` command";
-    const std::string limit = "3000000";
+    // Long enough (a few hundred milliseconds) for the kills to land inside the job, with
+    // checkpoints every 20 ms so that resumes start from all over the file.
+    const std::string limit = "300000000";
+    const std::string interval = "--checkpoint-interval=20";
 
     TempFolder reference, output;
     ASSERT_EQ(test::runCli({"--folder", reference.path(), "generate", limit}, output.path()).code,
               0);
     const std::string expected = readFile(reference.path() + "primes.txt");
     const std::string expectedCheckpoint = readFile(reference.path() + "primes.ini");
-    ASSERT_EQ(expected, test::oracleResults(3000000, false));
+    EXPECT_EQ(std::count(expected.begin(), expected.end(), '\n'), 16252325);  // pi(3 * 10^8)
 
     const unsigned seed = std::random_device{}();
     std::mt19937 random(seed);
-    std::uniform_int_distribution<int> killDelay(20, 300);
+    std::uniform_int_distribution<int> killDelay(5, 250);
     int resumes = 0, restarts = 0;
     for (int run = 0; run < 5; ++run) {
         TempFolder folder;
@@ -61,8 +65,9 @@ TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
             const bool resume = checkpoint && checkpoint->interrupted == 1;
             (resume ? resumes : restarts) += attempt > 0;
             const std::vector<std::string> args =
-                resume ? std::vector<std::string>{"--folder", folder.path(), "resume"}
-                       : std::vector<std::string>{"--folder", folder.path(), "generate", limit};
+                resume ? std::vector<std::string>{"--folder", folder.path(), "resume", interval}
+                       : std::vector<std::string>{"--folder", folder.path(), "generate", limit,
+                                                  interval};
             CliChild child(args, output.path());
             ASSERT_TRUE(child.started());
             const bool kill = attempt < 4;  // then let it run to its end
@@ -85,6 +90,7 @@ TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
             << "seed " << seed << ", run " << run << history;
         EXPECT_EQ(readFile(folder.path() + "primes.ini"), expectedCheckpoint);
     }
+    EXPECT_GT(resumes, 0) << "no kill landed inside a job; seed " << seed;
     RecordProperty("resumes", resumes);
     RecordProperty("restarts", restarts);
 }
