@@ -6,7 +6,7 @@
 set -euo pipefail
 
 root="$(cd "$(dirname "$0")/.." && pwd)"
-build="${1:-$root/build/w}"
+build="${1:-$root/build/release}"
 limit="${2:-1000000000}"
 cli="$build/tarn-cli"
 [ -x "$cli" ] || { echo "no $cli: build first" >&2; exit 1; }

@@ -2,10 +2,10 @@
 # Splits a results file of every prime up to 10^9 (about 50.8 million CR LF records) into files
 # of 1 000 000 records with tarn-cli split and with coreutils `split -l`, best of three runs
 # each in the same session, and prints the time ratio ours/theirs and our peak memory.
-# Usage: bench/split_vs_coreutils.sh [build-folder] [limit]   (default build/w, 1e9)
+# Usage: bench/split_vs_coreutils.sh [build-folder] [limit]   (default build/release, 1e9)
 set -euo pipefail
 root="$(cd "$(dirname "$0")/.." && pwd)"
-build="${1:-$root/build/w}"
+build="${1:-$root/build/release}"
 limit="${2:-1e9}"
 cli="$build/tarn-cli"
 [ -x "$cli" ] || { echo "no tarn-cli in $build: build it first" >&2; exit 1; }

@@ -1,5 +1,6 @@
 // tarn: the desktop program.
 #include <QApplication>
+#include <QSessionManager>
 
 #include "core/app_folder.hpp"
 #include "core/data_folder.hpp"
@@ -10,6 +11,9 @@
 #endif
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"
+#ifndef _WIN32
+#include "ui/termination_signals.hpp"
+#endif
 
 int main(int argc, char** argv) {
     QApplication app(argc, argv);
@@ -31,6 +35,17 @@ int main(int argc, char** argv) {
     shell.setOwner(reinterpret_cast<void*>(window.winId()));
 #else
     shell.setDialogParent(&window);
+#endif
+    // The program ends when the main window has really closed, which waits for a running job
+    // to leave through its stop path; the split window alone does not keep it alive.
+    QApplication::setQuitOnLastWindowClosed(false);
+    QObject::connect(&window, &tarn::ui::Form1::closed, &app, &QApplication::quit,
+                     Qt::QueuedConnection);
+    // Logging off or shutting down closes the window like the user does.
+    QObject::connect(&app, &QGuiApplication::commitDataRequest, &window,
+                     [&window](QSessionManager&) { window.close(); });
+#ifndef _WIN32
+    tarn::ui::closeOnTerminationSignals(window);
 #endif
     window.Form_Load();
     window.show();

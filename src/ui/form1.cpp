@@ -74,13 +74,14 @@ void Form1::closeEvent(QCloseEvent* event) {
     // Every way out stops a running job through its stop path, so that its checkpoint
     // describes the results file left behind; the program ends once the worker is done.
     requestClose();
+    if (splitWindow_) splitWindow_->close();
     if (jobRunning_ || numberRunning_) {
         event->ignore();
         hide();
         return;
     }
-    if (splitWindow_) splitWindow_->close();
     event->accept();
+    Q_EMIT closed();
 }
 
 void Form1::requestClose() {

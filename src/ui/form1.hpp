@@ -61,6 +61,8 @@ Q_SIGNALS:
     // Emitted once a worker's outcome has been shown.
     void numberCommandFinished();
     void jobFinished();
+    // The window has closed for good: no worker is left running. The program ends here.
+    void closed();
 
 protected:
     void closeEvent(QCloseEvent* event) override;

@@ -7,7 +7,10 @@
 
 #include "core/app_folder.hpp"
 #include "generation/checkpoint_file.hpp"
+#include "ui/termination_signals.hpp"
 #include "window_fixture.hpp"
+
+#include <csignal>
 
 using namespace tarn;
 using namespace tarn::test;
@@ -199,4 +202,20 @@ TEST_F(JobCommandTest, SplitResultFileShowsOneWindow) {
         if (w->isVisible() && w->windowTitle() == "Split Results File") ++visible;
     EXPECT_EQ(visible, 1);
     saveScreenshot(*first, "form2.png");
+}
+
+TEST_F(JobCommandTest, TerminationSignalClosesLikeTheUserAndKeepsTheJob) {
+    ui::closeOnTerminationSignals(*window);
+    QSignalSpy closed(window.get(), &ui::Form1::closed);
+    c().Text1->setText("900000000000");
+    c().Command1->click();
+    window->show();
+    ASSERT_EQ(::raise(SIGTERM), 0);
+    ASSERT_TRUE(waitUntil([&] { return closed.count() == 1; }));
+    EXPECT_FALSE(window->jobRunning());
+    EXPECT_TRUE(messages.shown.empty());
+    const auto stopped = readCheckpoint(dir.path() + "primes.ini");
+    ASSERT_TRUE(stopped);
+    EXPECT_EQ(stopped->interrupted, 1);
+    EXPECT_EQ(stopped->limit, 900000000000);
 }
