@@ -1,88 +1,51 @@
 // The entry rule and the Number type's conversions and text forms.
 #include <gtest/gtest.h>
 
-#include <cmath>
-
 #include "core/entry.hpp"
 
 using namespace tarn;
 
 namespace {
 
-std::int64_t accepted(std::string_view text, char sep = '.') {
-    const EntryResult r = ReadNumberEntry(text, sep);
-    EXPECT_TRUE(r.accepted()) << "text '" << text << "' was refused: " << r.message;
-    EXPECT_TRUE(r.message.empty());
-    return r.accepted() ? r.number->whole() : -1;
-}
-
-std::string refused(std::string_view text, char sep = '.') {
-    const EntryResult r = ReadNumberEntry(text, sep);
-    EXPECT_FALSE(r.accepted()) << "text '" << text << "' was accepted";
-    return r.message;
-}
-
 const std::string kInvalid(kInvalidEntryMessage);
 const std::string kRange(kOutOfRangeMessage);
 
-}  // namespace
-
-TEST(EntryRule, AcceptsWholeNumbersAtTheBounds) {
-    EXPECT_EQ(accepted("2"), 2);
-    EXPECT_EQ(accepted("922337203685277"), 922337203685277);
-    EXPECT_EQ(accepted("100"), 100);
+// The whole number accepted, or the message of the refusal.
+std::string entry(std::string_view text, char separator = '.') {
+    const EntryResult r = ReadNumberEntry(text, separator);
+    return r.accepted() ? std::to_string(r.number->whole()) : r.message;
 }
 
-TEST(EntryRule, TruncatesFractionsInsideTheRange) {
-    EXPECT_EQ(accepted("2.5"), 2);
-    EXPECT_EQ(accepted("2.9"), 2);
-    EXPECT_EQ(accepted("7.9"), 7);
-    EXPECT_EQ(accepted("100.9"), 100);
-    EXPECT_EQ(accepted("99.9"), 99);
+}  // namespace
+
+TEST(EntryRule, AcceptsAndTruncatesInsideTheRange) {
+    const std::pair<const char*, const char*> cases[] = {
+        {"2", "2"},         {"922337203685277", "922337203685277"}, {"2.5", "2"},
+        {"7.9", "7"},       {"100.9", "100"},                       {"99.9", "99"},
+        {"  97  ", "97"},   {"\t97", "97"},                         {"+97", "97"},
+        {"1e3", "1000"},    {"1.5E2", "150"},                       {"25e-1", "2"},
+        {".5e1", "5"},      {"5.", "5"}};
+    for (const auto& [text, whole] : cases) EXPECT_EQ(entry(text), whole) << "'" << text << "'";
 }
 
 TEST(EntryRule, ChecksTheRangeBeforeTruncating) {
-    EXPECT_EQ(refused("1.99"), kRange);
-    EXPECT_EQ(refused("1"), kRange);
-    EXPECT_EQ(refused("1.5"), kRange);
-    EXPECT_EQ(refused("922337203685278"), kRange);
-    EXPECT_EQ(refused("922337203685277.5"), kRange);
-    EXPECT_EQ(refused("922337203685477"), kRange);
-    EXPECT_EQ(refused("-5"), kRange);
-    EXPECT_EQ(refused("0"), kRange);
+    for (const char* text : {"1.99", "1", "1.5", "0", "-5", "922337203685278", "922337203685277.5",
+                             "922337203685477", "1e400", "-1e400", "1e-400"})
+        EXPECT_EQ(entry(text), kRange) << text;
+    EXPECT_EQ(entry(std::string(400, '9')), kRange);
 }
 
 TEST(EntryRule, RefusesTextThatIsNotANumber) {
     for (const char* text : {"", "   ", "abc", "12abc", "1 2", "--3", "+", ".", "1e", "1e+",
-                             "0x10", "inf", "nan", "1,000", "1.2.3", "e5", "١٢"}) {
-        EXPECT_EQ(refused(text), kInvalid) << "'" << text << "'";
-    }
-}
-
-TEST(EntryRule, AcceptsSignsBlanksAndExponents) {
-    EXPECT_EQ(accepted("  97  "), 97);
-    EXPECT_EQ(accepted("\t97"), 97);
-    EXPECT_EQ(accepted("+97"), 97);
-    EXPECT_EQ(accepted("1e3"), 1000);
-    EXPECT_EQ(accepted("1.5E2"), 150);
-    EXPECT_EQ(accepted("25e-1"), 2);
-    EXPECT_EQ(accepted(".5e1"), 5);
-    EXPECT_EQ(accepted("5."), 5);
+                             "0x10", "inf", "nan", "1,000", "1.2.3", "e5"})
+        EXPECT_EQ(entry(text), kInvalid) << "'" << text << "'";
 }
 
 TEST(EntryRule, UsesTheLocaleDecimalSeparatorAndThePoint) {
-    EXPECT_EQ(accepted("100,9", ','), 100);
-    EXPECT_EQ(accepted("100.9", ','), 100);
-    EXPECT_EQ(refused("1,99", ','), kRange);
-    // Without a comma locale a comma is no separator at all.
-    EXPECT_EQ(refused("100,9", '.'), kInvalid);
-}
-
-TEST(EntryRule, HugeAndTinyTextsAreNumbersOutOfRange) {
-    EXPECT_EQ(refused(std::string(400, '9')), kRange);
-    EXPECT_EQ(refused("1e400"), kRange);
-    EXPECT_EQ(refused("-1e400"), kRange);
-    EXPECT_EQ(refused("1e-400"), kRange);
+    EXPECT_EQ(entry("100,9", ','), "100");
+    EXPECT_EQ(entry("100.9", ','), "100");
+    EXPECT_EQ(entry("1,99", ','), kRange);
+    EXPECT_EQ(entry("100,9", '.'), kInvalid);  // without a comma locale, no separator at all
 }
 
 TEST(WholeEntry, ConvertsWithoutTheRangeAndReportsOverflowApart) {
@@ -94,17 +57,13 @@ TEST(WholeEntry, ConvertsWithoutTheRangeAndReportsOverflowApart) {
     EXPECT_TRUE(huge.message.empty());
 }
 
-TEST(NumberType, ConvertsTheUpperBoundBothWaysExactly) {
-    const Number n = Number::fromWhole(922337203685277);
-    EXPECT_EQ(n.toDouble(), 922337203685277.0);
-    EXPECT_EQ(Number::fromDouble(n.toDouble()), n);
-    EXPECT_EQ(doubleText(n.toDouble()), "922337203685277");
-}
-
-TEST(NumberType, RoundsToTheNearestTenThousandthAndRefusesOverflow) {
+TEST(NumberType, ConversionsAreExactAndOverflowIsRefused) {
+    const Number top = Number::fromWhole(922337203685277);
+    EXPECT_EQ(top.toDouble(), 922337203685277.0);
+    EXPECT_EQ(Number::fromDouble(top.toDouble()), top);
+    EXPECT_EQ(doubleText(top.toDouble()), "922337203685277");
     EXPECT_EQ(Number::fromDouble(1.23456).raw(), 12346);
     EXPECT_EQ(Number::fromDouble(-1.23454).raw(), -12345);
-    EXPECT_EQ(Number::fromDouble(2.5).raw(), 25000);
     EXPECT_EQ(Number::fromDouble(922337203685477.0).whole(), Number::kMaxWhole);
     EXPECT_THROW(Number::fromDouble(1e15), std::overflow_error);
     EXPECT_THROW(Number::fromWhole(Number::kMaxWhole + 1), std::overflow_error);
@@ -114,11 +73,9 @@ TEST(NumberType, RoundsToTheNearestTenThousandthAndRefusesOverflow) {
 TEST(NumberType, TextForms) {
     EXPECT_EQ(signedText(Number::fromWhole(360)), " 360");
     EXPECT_EQ(trimmedText(Number::fromWhole(360)), "360");
-    EXPECT_EQ(signedText(Number::fromWhole(0)), " 0");
     EXPECT_EQ(signedText(Number::fromWhole(-7)), "-7");
     EXPECT_EQ(signedText(Number::fromDouble(2.5)), " 2.5");
     EXPECT_EQ(signedText(Number::fromRaw(INT64_MIN)), "-922337203685477.5808");
     EXPECT_EQ(doubleText(2.0), "2");
     EXPECT_EQ(doubleText(10.01), "10.01");
-    EXPECT_EQ(doubleText(15.0), "15");
 }

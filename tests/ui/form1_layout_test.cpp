@@ -12,75 +12,65 @@
 using namespace tarn;
 using namespace tarn::test;
 
-namespace {
-
-// Place of a control inside its container, in pixels (designed in twips, 15 to a pixel).
-QRect designed(int left, int top, int width, int height) {
-    return QRect(left / 15, top / 15, width / 15, height / 15);
-}
-
-}  // namespace
 
 TEST_F(WindowTest, OpensInItsDesignedState) {
     EXPECT_EQ(window->windowTitle(), "Brindle - Tarn - Prime Numbers");
     EXPECT_FALSE(window->windowIcon().isNull());
     EXPECT_EQ(window->centralWidget()->size(), QSize(287, 419));
-
-    EXPECT_EQ(c().Frame1->title(), "Generate Primes ");
-    EXPECT_EQ(c().Frame2->title(), "Test Prime or Factorize");
-    EXPECT_TRUE(c().Frame1->font().bold());
-    EXPECT_TRUE(c().Frame1->styleSheet().contains("#0000ff"));
-    EXPECT_FALSE(c().Label1->font().bold());
-    EXPECT_EQ(c().Label1->text(), "Up to");
-    EXPECT_EQ(c().Text1->text(), "100");
-    EXPECT_EQ(c().Text2->text(), "100");
+    const std::pair<QString, QString> texts[] = {
+        {c().Frame1->title(), "Generate Primes "},
+        {c().Frame2->title(), "Test Prime or Factorize"},
+        {c().Label1->text(), "Up to"},
+        {c().Text1->text(), "100"},
+        {c().Label3->text(), "Enumerate results"},
+        {c().Label4->text(), "Open results when finished"},
+        {c().Label5->text(), "INFO:"},
+        {c().Label6->text(), "Elapsed Time: "},
+        {c().Command1->text(), "Generate"},
+        {c().Command3->text(), "Resume"},
+        {c().Label2->text(), "Number"},
+        {c().Text2->text(), "100"},
+        {c().Command2->text(), "Test"},
+        {c().Command6->text(), "Factorize"},
+        {c().Label7->text(), "Press Test or Factorize to Calculate..."},
+        {c().Text4->toPlainText(), ""},
+        {c().Command5->text(), "Cancel all calculations"},
+        {c().Command4->text(), "Click here: Visit Brindle at https://brindle.example"}};
+    for (const auto& [shown, designed] : texts) EXPECT_EQ(shown, designed);
     EXPECT_FALSE(c().Check1->isChecked());
     EXPECT_TRUE(c().Check2->isChecked());
-    EXPECT_EQ(c().Label3->text(), "Enumerate results");
-    EXPECT_EQ(c().Label4->text(), "Open results when finished");
-    EXPECT_EQ(c().Label5->text(), "INFO:");
-    EXPECT_TRUE(c().Label5->styleSheet().contains("#ff0000"));
-    EXPECT_EQ(c().Label6->text(), "Elapsed Time: ");
-    EXPECT_EQ(c().Command1->text(), "Generate");
-    EXPECT_EQ(c().Command3->text(), "Resume");
-    EXPECT_EQ(c().ProgressBar1->minimum(), 0);
     EXPECT_EQ(c().ProgressBar1->value(), 0);
-    EXPECT_EQ(c().Label2->text(), "Number");
-    EXPECT_EQ(c().Command2->text(), "Test");
-    EXPECT_EQ(c().Command6->text(), "Factorize");
-    EXPECT_EQ(c().Label7->text(), "Press Test or Factorize to Calculate...");
-    EXPECT_TRUE(c().Text4->toPlainText().isEmpty());
     EXPECT_EQ(c().Text4->verticalScrollBarPolicy(), Qt::ScrollBarAlwaysOn);
-    EXPECT_EQ(c().Command5->text(), "Cancel all calculations");
+    // Bold blue frame captions, a bold stop button, a red information line; the rest plain.
+    EXPECT_TRUE(c().Frame1->font().bold() && c().Frame2->font().bold());
+    EXPECT_TRUE(c().Frame1->styleSheet().contains("#0000ff"));
     EXPECT_TRUE(c().Command5->font().bold());
-    EXPECT_EQ(c().Command4->text(),
-              QString("Click here: Visit Brindle at ") + ui::kMakerWebAddress);
-    EXPECT_TRUE(QString(ui::kMakerWebAddress).startsWith("https://"));
-
+    EXPECT_FALSE(c().Label1->font().bold());
+    EXPECT_TRUE(c().Label5->styleSheet().contains("#ff0000"));
     // Nothing is ever disabled or hidden.
-    for (QWidget* w : window->centralWidget()->findChildren<QWidget*>()) {
+    for (QWidget* w : window->centralWidget()->findChildren<QWidget*>())
         EXPECT_TRUE(w->isEnabled()) << w->objectName().toStdString();
-    }
 }
 
 TEST_F(WindowTest, ControlsStandWhereDesigned) {
+    // Name, then left, top, width and height in twips inside the frame or the window.
     const std::vector<std::pair<QWidget*, QRect>> places = {
-        {c().Frame1, designed(240, 120, 3855, 2775)},  {c().Label1, designed(360, 360, 855, 255)},
-        {c().Text1, designed(840, 360, 2415, 285)},    {c().Check1, designed(360, 720, 135, 195)},
-        {c().Label3, designed(720, 720, 2295, 255)},   {c().Check2, designed(360, 960, 135, 195)},
-        {c().Label4, designed(720, 960, 2295, 255)},   {c().Label5, designed(360, 1200, 3015, 615)},
-        {c().Label6, designed(360, 1800, 2895, 255)},  {c().Command1, designed(360, 2040, 1575, 255)},
-        {c().Command3, designed(2040, 2040, 1335, 255)},
-        {c().ProgressBar1, designed(360, 2400, 3015, 255)},
-        {c().Frame2, designed(240, 3000, 3855, 2415)}, {c().Label2, designed(360, 360, 615, 255)},
-        {c().Text2, designed(1080, 360, 2295, 285)},   {c().Command2, designed(360, 840, 1335, 255)},
-        {c().Command6, designed(1800, 840, 1575, 255)},
-        {c().Label7, designed(360, 1200, 3015, 255)},  {c().Text4, designed(120, 1440, 3615, 855)},
-        {c().Command5, designed(240, 5520, 3855, 255)},
-        {c().Command4, designed(240, 5880, 3855, 255)},
+        {c().Frame1, {240, 120, 3855, 2775}},   {c().Label1, {360, 360, 855, 255}},
+        {c().Text1, {840, 360, 2415, 285}},     {c().Check1, {360, 720, 135, 195}},
+        {c().Label3, {720, 720, 2295, 255}},    {c().Check2, {360, 960, 135, 195}},
+        {c().Label4, {720, 960, 2295, 255}},    {c().Label5, {360, 1200, 3015, 615}},
+        {c().Label6, {360, 1800, 2895, 255}},   {c().Command1, {360, 2040, 1575, 255}},
+        {c().Command3, {2040, 2040, 1335, 255}}, {c().ProgressBar1, {360, 2400, 3015, 255}},
+        {c().Frame2, {240, 3000, 3855, 2415}},  {c().Label2, {360, 360, 615, 255}},
+        {c().Text2, {1080, 360, 2295, 285}},    {c().Command2, {360, 840, 1335, 255}},
+        {c().Command6, {1800, 840, 1575, 255}}, {c().Label7, {360, 1200, 3015, 255}},
+        {c().Text4, {120, 1440, 3615, 855}},    {c().Command5, {240, 5520, 3855, 255}},
+        {c().Command4, {240, 5880, 3855, 255}},
     };
-    for (const auto& [widget, place] : places)
-        EXPECT_EQ(widget->geometry(), place) << widget->objectName().toStdString();
+    for (const auto& [widget, twips] : places) {
+        const QRect pixels(twips.x() / 15, twips.y() / 15, twips.width() / 15, twips.height() / 15);
+        EXPECT_EQ(widget->geometry(), pixels) << widget->objectName().toStdString();
+    }
     EXPECT_EQ(c().Text1->parentWidget(), c().Frame1);
     EXPECT_EQ(c().Text4->parentWidget(), c().Frame2);
 }
@@ -133,12 +123,22 @@ TEST_F(WindowTest, ReadmeOpensInTheTextEditorOnlyWhenThere) {
     ASSERT_EQ(messages.shown.size(), 1u);
     EXPECT_EQ(messages.last().text, "no editor");
     EXPECT_EQ(messages.last().title, "Info");
+
+    // An installed copy opens the installed read-me, and only that one.
+    TempFolder doc;
+    shell.failure.clear();
+    window->setReadmePath(doc.path() + "README.txt");
+    window->readme_Click();
+    EXPECT_EQ(shell.edited.size(), 2u);
+    writeFile(doc.path() + "README.txt", "installed\n");
+    window->readme_Click();
+    ASSERT_EQ(shell.edited.size(), 3u);
+    EXPECT_EQ(shell.edited[2], doc.path() + "README.txt");
 }
 
 TEST_F(WindowTest, WebLinkOpensTheMakersSite) {
     c().Command4->click();
-    ASSERT_EQ(shell.urls.size(), 1u);
-    EXPECT_EQ(shell.urls[0], ui::kMakerWebAddress);
+    EXPECT_EQ(shell.urls, std::vector<std::string>{"https://brindle.example"});
     EXPECT_TRUE(messages.shown.empty());
 }
 
