@@ -75,7 +75,7 @@ private:
 
     // Test and Factorize.
     void finishTest(std::int64_t number, int code);
-    void finishFactorize(std::int64_t number, const std::string& line, bool stopped);
+    void finishFactorize(const std::string& line, bool stopped);
 
     // Generation and resume jobs.
     void startJobDisplay(std::int64_t limit, std::int64_t position);

@@ -50,7 +50,6 @@ void Form1::Command1_Click() {
     }
     jobStop_.clear();
     jobRunning_ = true;
-    jobProgress_.candidate = 0;
     startJobDisplay(limit, 0);
     const JobSpec spec{folder_, limit, enumerated};
     runOnWorker(
@@ -76,7 +75,6 @@ void Form1::Command3_Click() {
             startJobDisplay(start.limit, start.resumePoint);
         });
     };
-    jobProgress_.candidate = 0;
     runOnWorker(
         this, [this, events] { return runResume(folder_, jobStop_, &jobProgress_, events); },
         [this](const ResumeResult& result) {
@@ -127,9 +125,10 @@ void Form1::refreshJobDisplay() {
 }
 
 void Form1::finishJob(const JobResult& result) {
+    // A resume that ends while reading the file never showed any progress.
+    if (progressTimer_.isActive()) refreshJobDisplay();
     progressTimer_.stop();
     jobRunning_ = false;
-    refreshJobDisplay();
     if (!closingRequested_) {
         switch (result.status) {
             case JobResult::Status::Failed:

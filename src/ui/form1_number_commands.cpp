@@ -83,12 +83,12 @@ void Form1::Command6_Click() {
             if (!factors) return std::nullopt;
             return factorizationLine(number, *factors);
         },
-        [this, number](const std::optional<std::string>& line) {
-            finishFactorize(number, line.value_or(""), !line || numberStop_.requested());
+        [this](const std::optional<std::string>& line) {
+            finishFactorize(line.value_or(""), !line || numberStop_.requested());
         });
 }
 
-void Form1::finishFactorize(std::int64_t, const std::string& line, bool stopped) {
+void Form1::finishFactorize(const std::string& line, bool stopped) {
     numberRunning_ = false;
     // A stopped factorization writes nothing over what the stop button left.
     if (!stopped && !closingRequested_) {
