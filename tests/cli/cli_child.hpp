@@ -42,7 +42,6 @@ public:
     CliChild(const CliChild&) = delete;
     CliChild& operator=(const CliChild&) = delete;
 
-    bool started() const { return pid_ > 0; }
     void signal(int number) { ::kill(pid_, number); }
 
     // The exit code, or 128 + the signal that ended it; -1 when the program did not start.

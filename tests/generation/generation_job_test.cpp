@@ -1,11 +1,16 @@
 // The generation job against the oracle: byte-for-byte results files and checkpoint lines for
-// complete runs, stops after a chosen turn, continued (appended) runs, and the checkpoints written
-// while the job runs.
+// complete runs, stops after a chosen turn, continued (appended) runs, the checkpoints written
+// while the job runs, and write failures: a results file that fills up at a chosen byte or sits
+// on a full device, a folder that is not there, a checkpoint that cannot be rewritten. A failed
+// job must name the file and the reason, and leave a checkpoint that describes what the results
+// file really holds, so that a continued job completes it exactly.
 #include "generation/generation_job.hpp"
 
 #include <gtest/gtest.h>
 
-#include <mutex>
+#include <atomic>
+#include <cerrno>
+#include <filesystem>
 #include <random>
 #include <thread>
 
@@ -15,13 +20,8 @@
 namespace tarn {
 namespace {
 
+using namespace test;
 using Status = JobResult::Status;
-using test::completeCheckpoint;
-using test::oracleCheckpoint;
-using test::oracleResults;
-using test::primeCount;
-using test::readFile;
-using test::TempFolder;
 
 struct JobRun {
     JobResult result;
@@ -31,10 +31,8 @@ struct JobRun {
 JobRun runIn(const TempFolder& folder, JobSpec spec, const JobHooks& hooks = {},
              const StopSignal& stop = StopSignal{}) {
     spec.folder = folder.path();
-    JobRun r{runJob(spec, stop, nullptr, hooks), "", ""};
-    r.results = readFile(folder.path() + "primes.txt");
-    r.checkpoint = readFile(folder.path() + "primes.ini");
-    return r;
+    JobResult result = runJob(spec, stop, nullptr, hooks);
+    return {result, readFile(folder.path() + "primes.txt"), readFile(folder.path() + "primes.ini")};
 }
 
 void expectComplete(std::int64_t limit, bool enumerated, const JobHooks& hooks = {}) {
@@ -44,7 +42,6 @@ void expectComplete(std::int64_t limit, bool enumerated, const JobHooks& hooks =
     ASSERT_EQ(r.result.status, Status::Completed) << r.result.error;
     EXPECT_EQ(r.results, oracleResults(limit, enumerated));
     EXPECT_EQ(r.checkpoint, completeCheckpoint(limit));
-    EXPECT_EQ(r.result.candidate, test::nextTurnAbove(limit));
     EXPECT_EQ(r.result.primeCount, primeCount(limit));
 }
 
@@ -60,8 +57,8 @@ JobHooks stopAfter(StopSignal& stop, std::int64_t turns) {
 
 TEST(GenerationJob, CompleteRunsMatchTheOracle) {
     // Limits at and around the ends of wheel turns (30k + 7, 30k + 11).
-    for (const std::int64_t limit : {100, 110, 997, 1000, 1206, 1207, 1208, 1210, 1211, 1212,
-                                     30 * 331 + 7, 30 * 331 + 11})
+    for (const std::int64_t limit :
+         {100, 110, 997, 1000, 1206, 1207, 1208, 1210, 1211, 1212, 30 * 331 + 7, 30 * 331 + 11})
         for (const bool enumerated : {false, true}) expectComplete(limit, enumerated);
     // The first batch is one turn and the next 32768 turns; its end is turn 32769.
     const std::int64_t edge = 30 * 32769 + 11;
@@ -79,59 +76,40 @@ TEST(GenerationJob, CompleteRunsMatchTheOracle) {
     expectComplete(10'000'000, false);
 }
 
-// A stop leaves whole turns: the job ends at 30 * turns + 7, or completes when that turn was its
-// last. A stop asked before the start still lets the first turn run.
-TEST(GenerationJob, StopLeavesWholeTurns) {
+// A job stopped after `turns` turns (0: a stop asked before the start, which still lets the first
+// turn run), continued in append mode and stopped again 7 turns later, then continued to its end:
+// each stop leaves whole turns, the end the file of one uninterrupted run. A stop seen after the
+// last turn is a completion.
+TEST(GenerationJob, StoppedAndContinuedJobsGiveTheFileOfOneRun) {
     const std::pair<std::int64_t, std::int64_t> cases[] = {
-        {100'000, 0}, {100'000, 1}, {100'000, 2}, {100'000, 3}, {100'000, 50}, {100'000, 333},
-        {100, 3}};
+        {100'000, 0},   {100'000, 1},    {100'000, 2}, {100'000, 3}, {123'457, 40},
+        {100'000, 333}, {123'457, 1000}, {100, 1},     {100, 3}};
     for (const auto& [limit, turns] : cases) {
         for (const bool enumerated : {false, true}) {
             SCOPED_TRACE(std::to_string(turns) + " turns, limit " + std::to_string(limit));
             TempFolder folder;
-            StopSignal stop;
-            if (turns == 0) stop.request();
-            const JobRun r =
-                runIn(folder, JobSpec{"", limit, enumerated}, stopAfter(stop, turns), stop);
-            const std::int64_t last = 30 * std::max<std::int64_t>(turns, 1) + 7;
-            const bool completes = last + 4 > limit;
-            ASSERT_EQ(r.result.status, completes ? Status::Completed : Status::Stopped);
-            EXPECT_EQ(r.checkpoint, completes ? completeCheckpoint(limit)
-                                              : oracleCheckpoint(last, limit, 1));
-            EXPECT_EQ(r.results, oracleResults(std::min(last, limit), enumerated));
-            EXPECT_EQ(r.result.primeCount, primeCount(std::min(last, limit)));
-            if (!completes) {
-                EXPECT_EQ(r.result.candidate, last);
-            }
-        }
-    }
-}
-
-// Stopped, continued in append mode and stopped again, then continued to the end: the file of one
-// uninterrupted run.
-TEST(GenerationJob, ContinuedJobGivesTheSameFileAsOneRun) {
-    const std::int64_t limit = 123'457;
-    for (const bool enumerated : {false, true}) {
-        for (const std::int64_t turns : {1, 40, 1000}) {
-            SCOPED_TRACE(turns);
-            TempFolder folder;
             JobSpec spec{"", limit, enumerated};
-            std::int64_t last = 30 * turns + 7;
-            for (const std::int64_t stopAt : {turns, std::int64_t{7}}) {
+            std::int64_t last = 30 * std::max<std::int64_t>(turns, 1) + 7;
+            for (const std::int64_t stopAt : {turns, std::int64_t{7}, std::int64_t{-1}}) {
                 StopSignal stop;
-                const JobRun r = runIn(folder, spec, stopAfter(stop, stopAt), stop);
+                if (stopAt == 0) stop.request();
+                const JobRun r =
+                    runIn(folder, spec, stopAt < 0 ? JobHooks{} : stopAfter(stop, stopAt), stop);
+                if (stopAt < 0 || last + 4 > limit) {
+                    ASSERT_EQ(r.result.status, Status::Completed) << r.result.error;
+                    EXPECT_EQ(r.results, oracleResults(limit, enumerated));
+                    EXPECT_EQ(r.checkpoint, completeCheckpoint(limit));
+                    EXPECT_EQ(r.result.primeCount, primeCount(limit));
+                    break;
+                }
                 ASSERT_EQ(r.result.status, Status::Stopped);
                 EXPECT_EQ(r.result.candidate, last);
                 EXPECT_EQ(r.checkpoint, oracleCheckpoint(last, limit, 1));
                 EXPECT_EQ(r.results, oracleResults(last, enumerated));
+                EXPECT_EQ(r.result.primeCount, primeCount(last));
                 spec = {"", limit, enumerated, true, last + 4, r.result.primeCount};
                 last += 30 * 7;
             }
-            const JobRun r = runIn(folder, spec);
-            ASSERT_EQ(r.result.status, Status::Completed) << r.result.error;
-            EXPECT_EQ(r.results, oracleResults(limit, enumerated));
-            EXPECT_EQ(r.checkpoint, completeCheckpoint(limit));
-            EXPECT_EQ(r.result.primeCount, primeCount(limit));
         }
     }
 }
@@ -146,24 +124,119 @@ TEST(GenerationJob, CheckpointsDuringTheJobAgreeWithTheFile) {
     hooks.afterBatch = [](std::int64_t) {
         std::this_thread::sleep_for(std::chrono::microseconds(300));
     };
-    std::mutex mutex;
-    std::vector<std::string> faults;
-    int seen = 0;
+    std::atomic<int> seen = 0;
     hooks.afterCheckpoint = [&](const Checkpoint& c, std::uint64_t bytes) {
-        std::lock_guard lock(mutex);
         ++seen;
-        if (c.candidate % 30 != 7 || c.interrupted != 1 || c.limit != 2'000'000)
-            faults.push_back("checkpoint " + checkpointLine(c));
-        if (readFile(folder.path() + "primes.txt").substr(0, bytes) !=
-            oracleResults(c.candidate, true))
-            faults.push_back("file at " + std::to_string(c.candidate));
-        if (readCheckpoint(folder.path() + "primes.ini") != c) faults.push_back("ini differs");
+        EXPECT_EQ(c.candidate % 30, 7);
+        EXPECT_EQ(readFile(folder.path() + "primes.ini"),
+                  oracleCheckpoint(c.candidate, 2'000'000, 1));
+        EXPECT_TRUE(readFile(folder.path() + "primes.txt").substr(0, bytes) ==
+                    oracleResults(c.candidate, true))
+            << "file at " << c.candidate;
     };
     const JobRun r = runIn(folder, JobSpec{"", 2'000'000, true}, hooks);
     ASSERT_EQ(r.result.status, Status::Completed);
     EXPECT_GE(seen, 2);
-    EXPECT_TRUE(faults.empty()) << faults.front();
     EXPECT_EQ(r.checkpoint, completeCheckpoint(2'000'000));
+}
+
+// The real file, which reports a full disk once `capacity` bytes have been written.
+class FillingSink final : public ResultsSink {
+public:
+    FillingSink(std::unique_ptr<ResultsSink> file, std::uint64_t capacity)
+        : file_(std::move(file)), capacity_(capacity) {}
+    int write(const char* data, std::size_t size, std::size_t& written) override {
+        const std::size_t part =
+            std::min<std::uint64_t>(capacity_ - std::min(capacity_, used_), size);
+        const int error = file_->write(data, part, written);
+        used_ += written;
+        return error != 0 ? error : part < size ? ENOSPC : 0;
+    }
+    int sync() override { return file_->sync(); }
+    int truncate(std::uint64_t size) override { return file_->truncate(used_ = size); }
+    int close() override { return file_->close(); }
+
+private:
+    std::unique_ptr<ResultsSink> file_;
+    std::uint64_t capacity_, used_ = 0;
+};
+
+JobHooks fillingAt(std::uint64_t capacity) {
+    JobHooks hooks;
+    hooks.bufferBytes = 4096;
+    hooks.turnsPerBatch = 16;
+    hooks.openResults = [capacity](const std::string& path, bool append, int& error) {
+        auto file = openResultsFile(path, append, error);
+        return file ? std::make_unique<FillingSink>(std::move(file), capacity) : nullptr;
+    };
+    return hooks;
+}
+
+JobResult failIn(const std::string& folder, std::int64_t limit, const JobHooks& hooks = {},
+                 bool enumerated = false) {
+    const JobResult r = runJob(JobSpec{folder, limit, enumerated}, StopSignal{}, nullptr, hooks);
+    EXPECT_EQ(r.status, JobResult::Status::Failed);
+    return r;
+}
+
+// The failure message begins with the file and what went wrong.
+void expectError(const std::string& error, const std::string& start) {
+    EXPECT_EQ(error.substr(0, start.size()), start);
+}
+
+TEST(GenerationJobFailure, FullDiskLeavesWholeTurnsAndAContinuableCheckpoint) {
+    const std::int64_t limit = 300'000;
+    for (const std::uint64_t capacity : {21u, 4096u, 5000u, 40000u, 100001u}) {
+        for (const bool enumerated : {false, true}) {
+            SCOPED_TRACE(capacity);
+            TempFolder folder;
+            const JobResult failed = failIn(folder.path(), limit, fillingAt(capacity), enumerated);
+            expectError(failed.error,
+                        "The file " + folder.path() + "primes.txt could not be written: ");
+            EXPECT_NE(failed.error.find("No space left on device."), std::string::npos);
+            EXPECT_EQ(failed.candidate % 30, 7);
+            EXPECT_EQ(readFile(folder.path() + "primes.ini"),
+                      oracleCheckpoint(failed.candidate, limit, 1));
+            const std::string onDisk = readFile(folder.path() + "primes.txt");
+            EXPECT_LE(onDisk.size(), capacity);
+            EXPECT_EQ(onDisk, oracleResults(failed.candidate, enumerated));
+            EXPECT_EQ(failed.primeCount, primeCount(failed.candidate));
+        }
+    }
+}
+
+TEST(GenerationJobFailure, OtherFailuresNameTheFileAndTheReason) {
+    {  // No room even for the seed records: nothing to continue.
+        TempFolder folder;
+        failIn(folder.path(), 1000, fillingAt(5));
+        EXPECT_EQ(readFile(folder.path() + "primes.txt"), "");
+        EXPECT_EQ(readFile(folder.path() + "primes.ini"), " 11  1000  0 \r\n");
+    }
+    if (std::filesystem::exists("/dev/full")) {
+        TempFolder folder;
+        std::filesystem::create_symlink("/dev/full", folder.path() + "primes.txt");
+        expectError(failIn(folder.path(), 100'000).error,
+                    "The file " + folder.path() +
+                        "primes.txt could not be written: No space left on device.");
+        EXPECT_EQ(readCheckpoint(folder.path() + "primes.ini")->interrupted, 0);
+    }
+    {
+        TempFolder folder;
+        const std::string missing = folder.path() + "gone/";
+        EXPECT_EQ(failIn(missing, 1000).error,
+                  "The file " + missing +
+                      "primes.txt could not be opened for writing: No such file or directory.");
+        EXPECT_FALSE(std::filesystem::exists(missing));
+    }
+    // A folder in the way of the checkpoint's temporary file makes every rewrite fail, during
+    // the job and, with no checkpoint during it, at its end.
+    TempFolder folder;
+    std::filesystem::create_directory(folder.path() + "primes.ini.tmp");
+    JobHooks notDurable;
+    notDurable.durable = false;
+    for (const JobHooks& hooks : {JobHooks{}, notDurable})
+        expectError(failIn(folder.path(), 100'000, hooks).error,
+                    "The file " + folder.path() + "primes.ini could not be written: ");
 }
 
 }  // namespace

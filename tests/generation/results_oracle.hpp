@@ -43,16 +43,9 @@ inline std::string oracleCheckpoint(std::int64_t candidate, std::int64_t limit, 
     return line + "\r\n";
 }
 
-// The candidate a job that ran to its end leaves: the first turn start (30k + 11) above its limit.
-inline std::int64_t nextTurnAbove(std::int64_t limit) {
-    std::int64_t start = 11;
-    while (start <= limit) start += 30;
-    return start;
-}
-
-// The checkpoint of a job that ran to its end.
+// A job that ran to its end leaves as candidate the first turn start (30k + 11) above its limit.
 inline std::string completeCheckpoint(std::int64_t limit) {
-    return oracleCheckpoint(nextTurnAbove(limit), limit, 0);
+    return oracleCheckpoint(limit - (limit - 11) % 30 + 30, limit, 0);
 }
 
 }  // namespace tarn::test

@@ -10,39 +10,27 @@ namespace tarn {
 namespace {
 
 TEST(StartupCheck, PromptOnlyForAJobStoppedBelowItsLimit) {
-    const std::string fresh = " 101  100  0 \r\n";
-    struct Case {
-        std::string line;  // "<none>": no checkpoint
-        bool prompt;
-        bool replaced;  // by the fresh checkpoint
-    };
-    const Case cases[] = {
-        {"<none>", false, true},
-        {"", false, true},
-        {" 37 ", false, true},
-        {" 37  1000 \r\n", false, true},
-        {" 99999999999999999999  1000  1 \r\n", false, true},
-        {" 37  1000  99999 \r\n", false, true},
-        {"garbage\r\n", false, true},
-        {"37;1000;1\r\n", false, true},
-        {"\r\n\r\n", false, true},
-        {" 37  1000  1 \r\n", true, false},
-        {" 997  1000  1 \r\n", true, false},
-        {" 127  127  1 \r\n", false, false},
-        {" 127  105  1 \r\n", false, false},
-        {" 1001  1000  0 \r\n", false, false},
-        {" 37  1000  0 \r\n", false, false},
-        {" 37  1000  2 \r\n", false, false},
-        {" 37  1000 -1 \r\n", false, false},
-    };
-    for (const Case& c : cases) {
+    auto expect = [](const std::string& line, bool prompt, const std::string& after) {
         test::TempFolder folder;
-        if (c.line != "<none>") test::writeFile(folder.path() + "primes.ini", c.line);
-        EXPECT_EQ(checkCheckpointAtStartup(folder.path()).showInterruptedPrompt, c.prompt)
-            << c.line;
-        EXPECT_EQ(test::readFile(folder.path() + "primes.ini"), c.replaced ? fresh : c.line)
-            << c.line;
-    }
+        if (line != "<none>") test::writeFile(folder.path() + "primes.ini", line);
+        EXPECT_EQ(checkCheckpointAtStartup(folder.path()).showInterruptedPrompt, prompt) << line;
+        EXPECT_EQ(test::readFile(folder.path() + "primes.ini"), after) << line;
+    };
+    // Missing or unreadable: replaced by the fresh checkpoint without a word.
+    for (const std::string line : {"<none>", "", " 37 ", " 37  1000 \r\n", "garbage\r\n",
+                                   " 99999999999999999999  1000  1 \r\n", " 37  1000  99999 \r\n",
+                                   "37;1000;1\r\n", "\r\n\r\n"})
+        expect(line, false, " 101  100  0 \r\n");
+    // Readable: kept as it is.
+    for (const auto& [line, prompt] : {std::pair{" 37  1000  1 \r\n", true},
+                                       {" 997  1000  1 \r\n", true},
+                                       {" 127  127  1 \r\n", false},
+                                       {" 127  105  1 \r\n", false},
+                                       {" 1001  1000  0 \r\n", false},
+                                       {" 37  1000  0 \r\n", false},
+                                       {" 37  1000  2 \r\n", false},
+                                       {" 37  1000 -1 \r\n", false}})
+        expect(line, prompt, line);
 }
 
 }  // namespace
