@@ -1,57 +1,50 @@
-// The generation job against a plain sieve: byte-for-byte results files and checkpoint lines for
-// complete runs, stops after a chosen turn, continued (appended) runs, and the checkpoints written
-// while the job runs.
+// The generation job against the oracle: byte-for-byte results files and checkpoint lines for
+// complete runs, stops after a chosen turn, continued (appended) runs, the checkpoints written
+// while the job runs, and write failures: a results file that fills up at a chosen byte or sits
+// on a full device, a folder that is not there, a checkpoint that cannot be rewritten. A failed
+// job must name the file and the reason, and leave a checkpoint that describes what the results
+// file really holds, so that a continued job completes it exactly.
 #include "generation/generation_job.hpp"
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include <mutex>
-#include <thread>
+#include <atomic>
+#include <cerrno>
+#include <filesystem>
 #include <random>
+#include <thread>
 
-#include "generation/job_texts.hpp"
-#include "generation/prime_oracle.hpp"
+#include "generation/results_oracle.hpp"
 #include "support/temp_folder.hpp"
 
-using namespace tarn;
-using tarn::test::expectedResults;
-using tarn::test::nextTurnAbove;
-using tarn::test::readFile;
-using tarn::test::TempFolder;
-
+namespace tarn {
 namespace {
 
-const std::vector<std::int64_t>& oracle() {
-    static const std::vector<std::int64_t> primes = test::primesUpTo(10'000'000);
-    return primes;
-}
+using namespace test;
+using Status = JobResult::Status;
+using testing::StartsWith;
 
 struct JobRun {
     JobResult result;
-    std::string results;
-    std::string checkpoint;
+    std::string results, checkpoint;
 };
 
 JobRun runIn(const TempFolder& folder, JobSpec spec, const JobHooks& hooks = {},
-             const StopSignal* stopSignal = nullptr) {
+             const StopSignal& stop = StopSignal{}) {
     spec.folder = folder.path();
-    StopSignal idle;
-    JobRun r;
-    r.result = runJob(spec, stopSignal ? *stopSignal : idle, nullptr, hooks);
-    r.results = readFile(folder.path() + "primes.txt");
-    r.checkpoint = readFile(folder.path() + "primes.ini");
-    return r;
+    JobResult result = runJob(spec, stop, nullptr, hooks);
+    return {result, readFile(folder.path() + "primes.txt"), readFile(folder.path() + "primes.ini")};
 }
 
 void expectComplete(std::int64_t limit, bool enumerated, const JobHooks& hooks = {}) {
     SCOPED_TRACE("limit " + std::to_string(limit) + (enumerated ? " enumerated" : " plain"));
     TempFolder folder;
     const JobRun r = runIn(folder, JobSpec{"", limit, enumerated}, hooks);
-    ASSERT_EQ(r.result.status, JobResult::Status::Completed) << r.result.error;
-    EXPECT_EQ(r.results, expectedResults(oracle(), limit, enumerated));
-    EXPECT_EQ(r.result.candidate, nextTurnAbove(limit));
-    EXPECT_EQ(r.result.primeCount, test::countUpTo(oracle(), limit));
-    EXPECT_EQ(r.checkpoint, checkpointLine({nextTurnAbove(limit), limit, 0}));
+    ASSERT_EQ(r.result.status, Status::Completed) << r.result.error;
+    EXPECT_EQ(r.results, oracleResults(limit, enumerated));
+    EXPECT_EQ(r.checkpoint, completeCheckpoint(limit));
+    EXPECT_EQ(r.result.primeCount, primeCount(limit));
 }
 
 // A stop raised from inside the job once `turns` turns are done; one turn per batch.
@@ -64,160 +57,183 @@ JobHooks stopAfter(StopSignal& stop, std::int64_t turns) {
     return hooks;
 }
 
-}  // namespace
-
-TEST(GenerationJob, WorkedLimitsGiveTheDescribedFiles) {
-    TempFolder folder;
-    const JobRun r = runIn(folder, JobSpec{"", 100, false});
-    ASSERT_EQ(r.result.status, JobResult::Status::Completed);
-    EXPECT_EQ(r.checkpoint, " 101  100  0 \r\n");
-    EXPECT_EQ(r.results.substr(0, 12), "2\r\n3\r\n5\r\n7\r\n");
-    EXPECT_EQ(r.result.primeCount, 25);
-    EXPECT_EQ(completionReport(r.result),
-              "Done!!! The results were saved in the file " + folder.path() +
-                  "primes.txt. 25 primes found up to number 100... Save the file to other "
-                  "location.");
-    EXPECT_EQ(completionInfoLine(r.result), "INFO: 25 primes found up to number 100...");
-
-    const JobRun e = runIn(folder, JobSpec{"", 110, true});
-    EXPECT_EQ(e.checkpoint, " 131  110  0 \r\n");
-    EXPECT_EQ(e.results.substr(0, 20), "1;2\r\n2;3\r\n3;5\r\n4;7\r\n");
-    EXPECT_EQ(e.results.substr(e.results.size() - 8), "29;109\r\n");
-    EXPECT_EQ(completionInfoLine(e.result), "INFO: 29 primes found up to number 110...");
-
-    const JobRun k = runIn(folder, JobSpec{"", 1000, false});
-    EXPECT_EQ(k.checkpoint, " 1001  1000  0 \r\n");
-    EXPECT_EQ(k.result.primeCount, 168);
-}
-
-TEST(GenerationJob, LimitsAroundTurnEdgesMatchThePlainSieve) {
-    for (const std::int64_t limit : {100LL, 110LL, 1000LL, 1206LL, 1207LL, 1208LL, 1210LL, 1211LL,
-                                     1212LL, 30 * 331 + 7LL, 30 * 331 + 11LL, 997LL}) {
-        expectComplete(limit, false);
-        expectComplete(limit, true);
-    }
-}
-
-TEST(GenerationJob, LimitsAcrossSegmentBoundariesMatchThePlainSieve) {
+TEST(GenerationJob, CompleteRunsMatchTheOracle) {
+    // Limits at and around the ends of wheel turns (30k + 7, 30k + 11).
+    for (const std::int64_t limit :
+         {100, 110, 997, 1000, 1206, 1207, 1208, 1210, 1211, 1212, 30 * 331 + 7, 30 * 331 + 11})
+        for (const bool enumerated : {false, true}) expectComplete(limit, enumerated);
     // The first batch is one turn and the next 32768 turns; its end is turn 32769.
     const std::int64_t edge = 30 * 32769 + 11;
     for (const std::int64_t limit : {edge - 1, edge, edge + 1, edge + 30})
         expectComplete(limit, false);
     // Small batches and small buffers hand many partial buffers to the writer.
-    JobHooks hooks;
-    hooks.turnsPerBatch = 7;
-    hooks.bufferBytes = 4096;
-    expectComplete(200'000, true, hooks);
-    expectComplete(200'003, false, hooks);
-}
-
-TEST(GenerationJob, RandomLimitsMatchThePlainSieve) {
+    JobHooks small;
+    small.turnsPerBatch = 7;
+    small.bufferBytes = 4096;
+    expectComplete(200'000, true, small);
+    expectComplete(200'003, false, small);
     std::mt19937_64 random(20240601);
     std::uniform_int_distribution<std::int64_t> pick(100, 10'000'000);
     for (int i = 0; i < 4; ++i) expectComplete(pick(random), i % 2 == 1);
     expectComplete(10'000'000, false);
 }
 
-TEST(GenerationJob, StopAfterSomeTurnsLeavesWholeTurns) {
-    for (const std::int64_t turns : {1, 2, 3, 50, 333}) {
+// A job stopped after `turns` turns (0: a stop asked before the start, which still lets the first
+// turn run), continued in append mode and stopped again 7 turns later, then continued to its end:
+// each stop leaves whole turns, the end the file of one uninterrupted run. A stop seen after the
+// last turn is a completion.
+TEST(GenerationJob, StoppedAndContinuedJobsGiveTheFileOfOneRun) {
+    const std::pair<std::int64_t, std::int64_t> cases[] = {
+        {100'000, 0},   {100'000, 1},    {100'000, 2}, {100'000, 3}, {123'457, 40},
+        {100'000, 333}, {123'457, 1000}, {100, 1},     {100, 3}};
+    for (const auto& [limit, turns] : cases) {
         for (const bool enumerated : {false, true}) {
-            SCOPED_TRACE(turns);
+            SCOPED_TRACE(std::to_string(turns) + " turns, limit " + std::to_string(limit));
             TempFolder folder;
-            StopSignal stop;
-            const JobRun r =
-                runIn(folder, JobSpec{"", 100'000, enumerated}, stopAfter(stop, turns), &stop);
-            const std::int64_t last = 30 * turns + 7;
-            ASSERT_EQ(r.result.status, JobResult::Status::Stopped);
-            EXPECT_EQ(r.result.candidate, last);
-            EXPECT_EQ(r.checkpoint, checkpointLine({last, 100'000, 1}));
-            EXPECT_EQ(r.results, expectedResults(oracle(), last, enumerated));
-            EXPECT_EQ(r.result.primeCount, test::countUpTo(oracle(), last));
+            JobSpec spec{"", limit, enumerated};
+            std::int64_t last = 30 * std::max<std::int64_t>(turns, 1) + 7;
+            for (const std::int64_t stopAt : {turns, std::int64_t{7}, std::int64_t{-1}}) {
+                StopSignal stop;
+                if (stopAt == 0) stop.request();
+                const JobRun r =
+                    runIn(folder, spec, stopAt < 0 ? JobHooks{} : stopAfter(stop, stopAt), stop);
+                if (stopAt < 0 || last + 4 > limit) {
+                    ASSERT_EQ(r.result.status, Status::Completed) << r.result.error;
+                    EXPECT_EQ(r.results, oracleResults(limit, enumerated));
+                    EXPECT_EQ(r.checkpoint, completeCheckpoint(limit));
+                    EXPECT_EQ(r.result.primeCount, primeCount(limit));
+                    break;
+                }
+                ASSERT_EQ(r.result.status, Status::Stopped);
+                EXPECT_EQ(r.result.candidate, last);
+                EXPECT_EQ(r.checkpoint, oracleCheckpoint(last, limit, 1));
+                EXPECT_EQ(r.results, oracleResults(last, enumerated));
+                EXPECT_EQ(r.result.primeCount, primeCount(last));
+                spec = {"", limit, enumerated, true, last + 4, r.result.primeCount};
+                last += 30 * 7;
+            }
         }
     }
-}
-
-TEST(GenerationJob, StopAskedBeforeTheStartEndsAfterTheFirstTurn) {
-    TempFolder folder;
-    StopSignal stop;
-    stop.request();
-    const JobRun r = runIn(folder, JobSpec{"", 1'000'000, false}, {}, &stop);
-    ASSERT_EQ(r.result.status, JobResult::Status::Stopped);
-    EXPECT_EQ(r.checkpoint, " 37  1000000  1 \r\n");
-    EXPECT_EQ(r.results, "2\r\n3\r\n5\r\n7\r\n11\r\n13\r\n17\r\n19\r\n23\r\n29\r\n31\r\n37\r\n");
-    EXPECT_EQ(r.result.primeCount, 12);
-}
-
-TEST(GenerationJob, StopSeenAfterTheLastTurnCountsAsComplete) {
-    TempFolder folder;
-    StopSignal stop;
-    const JobRun r = runIn(folder, JobSpec{"", 100, false}, stopAfter(stop, 3), &stop);
-    EXPECT_EQ(r.result.status, JobResult::Status::Completed);
-    EXPECT_EQ(r.checkpoint, " 101  100  0 \r\n");
-}
-
-TEST(GenerationJob, ContinuedJobGivesTheSameFileAsOneRun) {
-    for (const bool enumerated : {false, true}) {
-        for (const std::int64_t turns : {1, 40, 1000}) {
-            SCOPED_TRACE(turns);
-            const std::int64_t limit = 123'457;
-            TempFolder folder;
-            StopSignal stop;
-            const JobRun first =
-                runIn(folder, JobSpec{"", limit, enumerated}, stopAfter(stop, turns), &stop);
-            ASSERT_EQ(first.result.status, JobResult::Status::Stopped);
-            JobSpec next{
-                "", limit, enumerated, true, first.result.candidate + 4, first.result.primeCount};
-            StopSignal idle;
-            const JobRun second = runIn(folder, next);
-            ASSERT_EQ(second.result.status, JobResult::Status::Completed) << second.result.error;
-            EXPECT_EQ(second.results, expectedResults(oracle(), limit, enumerated));
-            EXPECT_EQ(second.checkpoint, checkpointLine({nextTurnAbove(limit), limit, 0}));
-            EXPECT_EQ(second.result.primeCount, test::countUpTo(oracle(), limit));
-        }
-    }
-}
-
-TEST(GenerationJob, ContinuedJobPastItsLimitWritesNothing) {
-    TempFolder folder;
-    test::writeFile(folder.path() + "primes.txt", "2\r\n");
-    const JobRun r = runIn(folder, JobSpec{"", 100, false, true, 101, 25});
-    EXPECT_EQ(r.result.status, JobResult::Status::Completed);
-    EXPECT_EQ(r.results, "2\r\n");
-    EXPECT_EQ(r.checkpoint, " 101  100  0 \r\n");
 }
 
 TEST(GenerationJob, CheckpointsDuringTheJobAgreeWithTheFile) {
     TempFolder folder;
-    const std::string resultsPath = folder.path() + "primes.txt";
     JobHooks hooks;
     hooks.checkpointInterval = std::chrono::milliseconds(0);
     hooks.turnsPerBatch = 64;
     hooks.bufferBytes = 4096;
     // Slow the sieve down so that the checkpointer gets many turns whatever the machine's speed.
-    hooks.afterBatch = [](std::int64_t) { std::this_thread::sleep_for(std::chrono::microseconds(300)); };
-    std::mutex mutex;
-    std::vector<std::string> faults;
-    int seen = 0;
+    hooks.afterBatch = [](std::int64_t) {
+        std::this_thread::sleep_for(std::chrono::microseconds(300));
+    };
+    std::atomic<int> seen = 0;
     hooks.afterCheckpoint = [&](const Checkpoint& c, std::uint64_t bytes) {
-        std::lock_guard lock(mutex);
         ++seen;
-        const std::string expected = expectedResults(oracle(), c.candidate, true);
-        const std::string onDisk = readFile(resultsPath).substr(0, bytes);
-        if (c.candidate % 30 != 7 || c.interrupted != 1 || c.limit != 2'000'000)
-            faults.push_back("checkpoint " + checkpointLine(c));
-        if (onDisk != expected) faults.push_back("file at " + std::to_string(c.candidate));
-        if (readCheckpoint(folder.path() + "primes.ini") != c) faults.push_back("ini differs");
+        EXPECT_EQ(c.candidate % 30, 7);
+        EXPECT_EQ(readFile(folder.path() + "primes.ini"),
+                  oracleCheckpoint(c.candidate, 2'000'000, 1));
+        EXPECT_TRUE(readFile(folder.path() + "primes.txt").substr(0, bytes) ==
+                    oracleResults(c.candidate, true))
+            << "file at " << c.candidate;
     };
     const JobRun r = runIn(folder, JobSpec{"", 2'000'000, true}, hooks);
-    ASSERT_EQ(r.result.status, JobResult::Status::Completed);
+    ASSERT_EQ(r.result.status, Status::Completed);
     EXPECT_GE(seen, 2);
-    EXPECT_TRUE(faults.empty()) << faults.front();
-    EXPECT_EQ(r.checkpoint, checkpointLine({nextTurnAbove(2'000'000), 2'000'000, 0}));
+    EXPECT_EQ(r.checkpoint, completeCheckpoint(2'000'000));
 }
 
-TEST(GenerationJob, MinimumOfTheGenerateCommand) {
-    EXPECT_EQ(checkGenerationMinimum(99), std::optional<std::string>("Minimum value is 100"));
-    EXPECT_EQ(checkGenerationMinimum(Number::fromWhole(2)), "Minimum value is 100");
-    EXPECT_FALSE(checkGenerationMinimum(100).has_value());
-    EXPECT_FALSE(checkGenerationMinimum(Number::fromWhole(922337203685277)).has_value());
+// The real file, which reports a full disk once `capacity` bytes have been written.
+class FillingSink final : public ResultsSink {
+public:
+    FillingSink(std::unique_ptr<ResultsSink> file, std::uint64_t capacity)
+        : file_(std::move(file)), capacity_(capacity) {}
+    int write(const char* data, std::size_t size, std::size_t& written) override {
+        const std::size_t part =
+            std::min<std::uint64_t>(capacity_ - std::min(capacity_, used_), size);
+        const int error = file_->write(data, part, written);
+        used_ += written;
+        return error != 0 ? error : part < size ? ENOSPC : 0;
+    }
+    int sync() override { return file_->sync(); }
+    int truncate(std::uint64_t size) override { return file_->truncate(used_ = size); }
+    int close() override { return file_->close(); }
+
+private:
+    std::unique_ptr<ResultsSink> file_;
+    std::uint64_t capacity_, used_ = 0;
+};
+
+JobHooks fillingAt(std::uint64_t capacity) {
+    JobHooks hooks;
+    hooks.bufferBytes = 4096;
+    hooks.turnsPerBatch = 16;
+    hooks.openResults = [capacity](const std::string& path, bool append, int& error) {
+        auto file = openResultsFile(path, append, error);
+        return file ? std::make_unique<FillingSink>(std::move(file), capacity) : nullptr;
+    };
+    return hooks;
 }
+
+JobResult failIn(const std::string& folder, std::int64_t limit, const JobHooks& hooks = {},
+                 bool enumerated = false) {
+    const JobResult r = runJob(JobSpec{folder, limit, enumerated}, StopSignal{}, nullptr, hooks);
+    EXPECT_EQ(r.status, JobResult::Status::Failed);
+    return r;
+}
+
+TEST(GenerationJobFailure, FullDiskLeavesWholeTurnsAndAContinuableCheckpoint) {
+    const std::int64_t limit = 300'000;
+    for (const std::uint64_t capacity : {21u, 4096u, 5000u, 40000u, 100001u}) {
+        for (const bool enumerated : {false, true}) {
+            SCOPED_TRACE(capacity);
+            TempFolder folder;
+            const JobResult failed = failIn(folder.path(), limit, fillingAt(capacity), enumerated);
+            EXPECT_EQ(failed.error,
+                      "The file " + folder.path() +
+                          "primes.txt could not be written: No space left on device.");
+            EXPECT_EQ(failed.candidate % 30, 7);
+            EXPECT_EQ(readFile(folder.path() + "primes.ini"),
+                      oracleCheckpoint(failed.candidate, limit, 1));
+            EXPECT_EQ(readFile(folder.path() + "primes.txt"),
+                      oracleResults(failed.candidate, enumerated));
+            EXPECT_EQ(failed.primeCount, primeCount(failed.candidate));
+        }
+    }
+}
+
+TEST(GenerationJobFailure, OtherFailuresNameTheFileAndTheReason) {
+    {  // No room even for the seed records: nothing to continue.
+        TempFolder folder;
+        failIn(folder.path(), 1000, fillingAt(5));
+        EXPECT_EQ(readFile(folder.path() + "primes.txt"), "");
+        EXPECT_EQ(readFile(folder.path() + "primes.ini"), " 11  1000  0 \r\n");
+    }
+    if (std::filesystem::exists("/dev/full")) {
+        TempFolder folder;
+        std::filesystem::create_symlink("/dev/full", folder.path() + "primes.txt");
+        EXPECT_THAT(failIn(folder.path(), 100'000).error,
+                    StartsWith("The file " + folder.path() +
+                               "primes.txt could not be written: No space left on device."));
+        EXPECT_EQ(readCheckpoint(folder.path() + "primes.ini")->interrupted, 0);
+    }
+    {
+        TempFolder folder;
+        const std::string missing = folder.path() + "gone/";
+        EXPECT_EQ(failIn(missing, 1000).error,
+                  "The file " + missing +
+                      "primes.txt could not be opened for writing: No such file or directory.");
+        EXPECT_FALSE(std::filesystem::exists(missing));
+    }
+    // A folder in the way of the checkpoint's temporary file makes every rewrite fail, during
+    // the job and, with no checkpoint during it, at its end.
+    TempFolder folder;
+    std::filesystem::create_directory(folder.path() + "primes.ini.tmp");
+    JobHooks notDurable;
+    notDurable.durable = false;
+    for (const JobHooks& hooks : {JobHooks{}, notDurable})
+        EXPECT_THAT(failIn(folder.path(), 100'000, hooks).error,
+                    StartsWith("The file " + folder.path() + "primes.ini could not be written: "));
+}
+
+}  // namespace
+}  // namespace tarn

@@ -1,6 +1,6 @@
 // An independent picture of what a generation job leaves behind: a plain sieve of Eratosthenes,
-// the records of every prime up to a bound in either form, and checkpoint lines spelled out by
-// hand. Tests craft stopped jobs with it and compare finished files byte for byte.
+// the results file of every prime up to a bound in either form, and the checkpoint line spelled
+// out by hand. Tests craft stopped jobs with it and compare finished files byte for byte.
 #pragma once
 
 #include <cstdint>
@@ -20,34 +20,32 @@ inline std::vector<std::int64_t> sievePrimes(std::int64_t upTo) {
     return primes;
 }
 
-// The results file of a job that has written every prime up to `upTo`.
+inline std::int64_t primeCount(std::int64_t upTo) {
+    return static_cast<std::int64_t>(sievePrimes(upTo).size());
+}
+
+// The records of a job that has written every prime up to `upTo` (its limit, or its stop).
 inline std::string oracleResults(std::int64_t upTo, bool enumerated) {
     std::string text;
     std::int64_t serial = 0;
     for (const std::int64_t p : sievePrimes(upTo)) {
-        ++serial;
-        if (enumerated) text += std::to_string(serial) + ";";
+        if (enumerated) text += std::to_string(++serial) + ";";
         text += std::to_string(p) + "\r\n";
     }
     return text;
 }
 
+// For non-negative fields only; tests spell out other lines in full.
 inline std::string oracleCheckpoint(std::int64_t candidate, std::int64_t limit, int interrupted) {
     std::string line;
-    for (const std::int64_t v : {candidate, limit, std::int64_t{interrupted}}) {
-        if (v >= 0) line += ' ';
-        line += std::to_string(v);
-        line += ' ';
-    }
-    line += "\r\n";
-    return line;
+    for (const std::int64_t field : {candidate, limit, std::int64_t{interrupted}})
+        line.append(" ").append(std::to_string(field)).append(" ");
+    return line + "\r\n";
 }
 
-// Where a job that ran to its end leaves its candidate: the first turn start above the limit.
-inline std::int64_t nextTurnAbove(std::int64_t limit) {
-    std::int64_t s = 11;
-    while (s <= limit) s += 30;
-    return s;
+// A job that ran to its end leaves as candidate the first turn start (30k + 11) above its limit.
+inline std::string completeCheckpoint(std::int64_t limit) {
+    return oracleCheckpoint(limit - (limit - 11) % 30 + 30, limit, 0);
 }
 
 }  // namespace tarn::test

@@ -6,7 +6,6 @@
 #include <signal.h>
 #include <spawn.h>
 #include <sys/wait.h>
-#include <unistd.h>
 
 #include <string>
 #include <vector>
@@ -20,24 +19,22 @@ namespace tarn::test {
 class CliChild {
 public:
     // Starts TARN_CLI_PATH with `args`; stdout and stderr go to files in `outputFolder`.
-    CliChild(const std::vector<std::string>& args, const std::string& outputFolder)
+    CliChild(std::vector<std::string> args, const std::string& outputFolder)
         : outPath_(outputFolder + "cli.out"), errPath_(outputFolder + "cli.err") {
-        std::vector<std::string> all{TARN_CLI_PATH};
-        all.insert(all.end(), args.begin(), args.end());
+        args.insert(args.begin(), TARN_CLI_PATH);
         std::vector<char*> argv;
-        for (std::string& a : all) argv.push_back(a.data());
+        for (std::string& a : args) argv.push_back(a.data());
         argv.push_back(nullptr);
         posix_spawn_file_actions_t actions;
         posix_spawn_file_actions_init(&actions);
-        posix_spawn_file_actions_addopen(&actions, 1, outPath_.c_str(),
-                                         O_WRONLY | O_CREAT | O_TRUNC, 0644);
-        posix_spawn_file_actions_addopen(&actions, 2, errPath_.c_str(),
-                                         O_WRONLY | O_CREAT | O_TRUNC, 0644);
+        for (const auto& [fd, path] : {std::pair{1, &outPath_}, std::pair{2, &errPath_}})
+            posix_spawn_file_actions_addopen(&actions, fd, path->c_str(),
+                                             O_WRONLY | O_CREAT | O_TRUNC, 0644);
         if (posix_spawn(&pid_, argv[0], &actions, nullptr, argv.data(), environ) != 0) pid_ = -1;
         posix_spawn_file_actions_destroy(&actions);
     }
     ~CliChild() {
-        if (pid_ > 0 && !reaped_) {
+        if (pid_ > 0 && code_ < 0) {
             ::kill(pid_, SIGKILL);
             wait();
         }
@@ -45,19 +42,15 @@ public:
     CliChild(const CliChild&) = delete;
     CliChild& operator=(const CliChild&) = delete;
 
-    bool started() const { return pid_ > 0; }
     void signal(int number) { ::kill(pid_, number); }
 
-    // The exit code, or 128 + the signal that ended it.
+    // The exit code, or 128 + the signal that ended it; -1 when the program did not start.
     int wait() {
-        if (!reaped_) {
-            int status = 0;
-            while (::waitpid(pid_, &status, 0) < 0) {
-            }
-            reaped_ = true;
-            code_ = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+        int status = 0;
+        if (pid_ <= 0 || code_ >= 0) return code_;
+        while (::waitpid(pid_, &status, 0) < 0) {
         }
-        return code_;
+        return code_ = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
     }
     std::string out() const { return readFile(outPath_); }
     std::string err() const { return readFile(errPath_); }
@@ -65,7 +58,6 @@ public:
 private:
     std::string outPath_, errPath_;
     pid_t pid_ = -1;
-    bool reaped_ = false;
     int code_ = -1;
 };
 
