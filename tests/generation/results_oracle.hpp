@@ -7,16 +7,15 @@
 #include <string>
 #include <vector>
 
+#include "support/plain_sieve.hpp"
+
 namespace tarn::test {
 
 inline std::vector<std::int64_t> sievePrimes(std::int64_t upTo) {
-    std::vector<bool> composite(static_cast<std::size_t>(upTo + 1), false);
+    const std::vector<bool> prime = plainSieve(static_cast<std::size_t>(upTo));
     std::vector<std::int64_t> primes;
-    for (std::int64_t n = 2; n <= upTo; ++n) {
-        if (composite[n]) continue;
-        primes.push_back(n);
-        for (std::int64_t m = n * n; m <= upTo; m += n) composite[m] = true;
-    }
+    for (std::int64_t n = 2; n <= upTo; ++n)
+        if (prime[static_cast<std::size_t>(n)]) primes.push_back(n);
     return primes;
 }
 
