@@ -18,8 +18,10 @@ namespace tarn::test {
 
 class CliChild {
 public:
-    // Starts TARN_CLI_PATH with `args`; stdout and stderr go to files in `outputFolder`.
-    CliChild(std::vector<std::string> args, const std::string& outputFolder)
+    // Starts TARN_CLI_PATH with `args`; stdout and stderr go to files in `outputFolder`, and
+    // standard input comes from `inputPath` when one is given.
+    CliChild(std::vector<std::string> args, const std::string& outputFolder,
+             const std::string& inputPath = "")
         : outPath_(outputFolder + "cli.out"), errPath_(outputFolder + "cli.err") {
         args.insert(args.begin(), TARN_CLI_PATH);
         std::vector<char*> argv;
@@ -27,6 +29,8 @@ public:
         argv.push_back(nullptr);
         posix_spawn_file_actions_t actions;
         posix_spawn_file_actions_init(&actions);
+        if (!inputPath.empty())
+            posix_spawn_file_actions_addopen(&actions, 0, inputPath.c_str(), O_RDONLY, 0);
         for (const auto& [fd, path] : {std::pair{1, &outPath_}, std::pair{2, &errPath_}})
             posix_spawn_file_actions_addopen(&actions, fd, path->c_str(),
                                              O_WRONLY | O_CREAT | O_TRUNC, 0644);
@@ -52,6 +56,14 @@ public:
         }
         return code_ = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
     }
+    // Whether it has ended, without waiting for it.
+    bool finished() {
+        int status = 0;
+        if (pid_ <= 0 || code_ >= 0) return true;
+        if (::waitpid(pid_, &status, WNOHANG) != pid_) return false;
+        code_ = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+        return true;
+    }
     std::string out() const { return readFile(outPath_); }
     std::string err() const { return readFile(errPath_); }
 
@@ -66,8 +78,11 @@ struct CliRun {
     std::string out, err;
 };
 
-inline CliRun runCli(const std::vector<std::string>& args, const std::string& outputFolder) {
-    CliChild child(args, outputFolder);
+// Runs the program to its end, with `input` on standard input.
+inline CliRun runCli(const std::vector<std::string>& args, const std::string& outputFolder,
+                     const std::string& input = "") {
+    writeFile(outputFolder + "cli.in", input);
+    CliChild child(args, outputFolder, outputFolder + "cli.in");
     const int code = child.wait();
     return {code, child.out(), child.err()};
 }

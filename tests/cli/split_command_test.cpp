@@ -11,7 +11,7 @@
 #include <filesystem>
 #include <string>
 
-#include "support/temp_folder.hpp"
+#include "cli_child.hpp"
 
 using tarn::test::readFile;
 
@@ -29,14 +29,13 @@ struct SplitCommand : ::testing::Test {
 
     // Runs `split --records count` on the data folder's results file into the other folder.
     int split(const std::string& count) {
-        const std::string command = std::string(TARN_CLI_PATH) + " --folder " + data.path() +
-                                    " split --records " + count + " --into " +
-                                    into.path().substr(0, into.path().size() - 1) + " >" +
-                                    scratch.path() + "out 2>" + scratch.path() + "err";
-        const int status = std::system(command.c_str());
-        out = readFile(scratch.path() + "out");
-        err = readFile(scratch.path() + "err");
-        return WEXITSTATUS(status);
+        const tarn::test::CliRun run = tarn::test::runCli(
+            {"--folder", data.path(), "split", "--records", count, "--into",
+             into.path().substr(0, into.path().size() - 1)},
+            scratch.path());
+        out = run.out;
+        err = run.err;
+        return run.code;
     }
     std::string file(int n) const { return into.path() + "primes" + std::to_string(n) + ".txt"; }
 };
@@ -63,37 +62,29 @@ TEST_F(SplitCommand, ExitCodesAndStreams) {
 TEST_F(SplitCommand, CtrlCStopsBetweenRecordsWithExitCodeThree) {
     // The results file is a pipe that this test feeds, so the split is surely running, and
     // waiting for more records, when the interrupt comes.
-    const std::string results = data.path() + "primes.txt", outPath = scratch.path() + "out";
+    const std::string results = data.path() + "primes.txt";
     ASSERT_EQ(mkfifo(results.c_str(), 0600), 0);
-    const pid_t pid = fork();
-    ASSERT_GE(pid, 0);
-    if (pid == 0) {
-        std::freopen(outPath.c_str(), "w", stdout);
-        execl(TARN_CLI_PATH, TARN_CLI_PATH, "--folder", data.path().c_str(), "split", "--records",
-              "1000", "--into", into.path().c_str(), static_cast<char*>(nullptr));
-        _exit(127);
-    }
+    tarn::test::CliChild child(
+        {"--folder", data.path(), "split", "--records", "1000", "--into", into.path()},
+        scratch.path());
     const auto oldPipeAction = std::signal(SIGPIPE, SIG_IGN);
     std::FILE* feed = std::fopen(results.c_str(), "w");  // waits for the reader
-    int status = 0;
-    pid_t done = 0;
+    bool done = false;
     // The interrupt may meet the split just before it waits for the pipe again; more records
     // wake it up until it has seen the stop and left.
-    for (int more = 0; feed && done == 0 && more <= 1000; ++more) {
+    for (int more = 0; feed && !done && more <= 1000; ++more) {
         std::fputs(more ? ("2;" + std::to_string(more) + "\r\n").c_str() : records(1500).c_str(),
                    feed);
         std::fflush(feed);
-        if (more == 0) kill(pid, SIGINT);
+        if (more == 0) child.signal(SIGINT);
         usleep(5000);
-        done = waitpid(pid, &status, WNOHANG);
+        done = child.finished();
     }
-    if (done == 0) kill(pid, SIGKILL), waitpid(pid, &status, 0);
     if (feed) std::fclose(feed);
     std::signal(SIGPIPE, oldPipeAction);
-    ASSERT_NE(done, 0) << "the split did not stop";
-    ASSERT_TRUE(WIFEXITED(status));
-    EXPECT_EQ(WEXITSTATUS(status), 3);
-    const std::string printed = readFile(outPath);
+    ASSERT_TRUE(done) << "the split did not stop";
+    EXPECT_EQ(child.wait(), 3);
+    const std::string printed = child.out();
     EXPECT_TRUE(printed.starts_with("Done!!! ") && printed.ends_with(" files were created.\n"))
         << printed;
 }
