@@ -8,12 +8,21 @@
 #include <cerrno>
 #include <cstring>
 #include <memory>
+#include <optional>
 #include <string_view>
 
-#include "generation/gap_primality.hpp"
+#include "core/miller_rabin.hpp"
 
 namespace tarn {
 namespace {
+
+// The smallest prime p with low < p <= high, or nothing. When the files agree the window is
+// shorter than a prime gap, so only a handful of numbers are ever tested.
+std::optional<std::int64_t> firstPrimeAbove(std::int64_t low, std::int64_t high) {
+    for (std::int64_t n = low < 1 ? 2 : low + 1; n <= high; ++n)
+        if (IsPrime64(static_cast<std::uint64_t>(n))) return n;
+    return std::nullopt;
+}
 
 constexpr std::size_t kBlockBytes = std::size_t{1} << 20;
 // The longest record the writers produce is a 14-digit serial number, ';', a 15-digit prime and
