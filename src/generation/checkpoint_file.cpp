@@ -9,6 +9,8 @@
 #include <fstream>
 #include <iterator>
 
+#include "core/file_messages.hpp"
+
 namespace tarn {
 namespace {
 
@@ -37,8 +39,6 @@ std::optional<std::int64_t> nextNumber(const std::string& text, std::size_t& pos
     if (value < low || value > high) return std::nullopt;
     return static_cast<std::int64_t>(value);
 }
-
-std::string systemReason(int error) { return std::strerror(error); }
 
 }  // namespace
 

@@ -20,6 +20,7 @@
 #include <thread>
 #include <vector>
 
+#include "core/file_messages.hpp"
 #include "generation/file_names.hpp"
 #include "generation/job_texts.hpp"
 #include "generation/record_formatter.hpp"
@@ -31,8 +32,6 @@ namespace {
 constexpr std::int64_t kSegmentTurns = 32 * 1024;
 constexpr std::size_t kBufferBytes = 4u << 20;
 constexpr int kBufferCount = 4;
-
-std::string reasonText(int error) { return std::strerror(error); }
 
 struct Buffer {
     std::vector<char> bytes;
@@ -311,7 +310,7 @@ JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progr
                           : openResultsFile(result.resultsPath, spec.append, openError);
     if (!sink) {
         // Nothing was touched: the checkpoint still describes the files as they are.
-        result.error = fileCreateFailure(result.resultsPath, reasonText(openError));
+        result.error = fileCreateFailure(result.resultsPath, systemReason(openError));
         return result;
     }
 
@@ -355,7 +354,7 @@ JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progr
         if (pipeline.failed()) {
             result.status = JobResult::Status::Failed;
             if (failure != 0) {
-                result.error = fileWriteFailure(result.resultsPath, reasonText(failure));
+                result.error = fileWriteFailure(result.resultsPath, systemReason(failure));
             } else {
                 result.error = fileWriteFailure(checkpointPath, pipeline.checkpointError());
             }
@@ -366,7 +365,7 @@ JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progr
                 result.error.append(" The file ")
                     .append(result.resultsPath)
                     .append(" may end with an incomplete record: ")
-                    .append(reasonText(cut))
+                    .append(systemReason(cut))
                     .append(".");
             }
             sink->sync();
@@ -394,7 +393,7 @@ JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progr
     if (error != 0) {
         // The system could not confirm the records: claim none past the last flush.
         result.status = JobResult::Status::Failed;
-        result.error = fileWriteFailure(result.resultsPath, reasonText(error));
+        result.error = fileWriteFailure(result.resultsPath, systemReason(error));
         return result;
     }
     const Checkpoint checkpoint{result.candidate, spec.limit, stopped ? 1 : 0};

@@ -15,14 +15,6 @@ std::optional<std::string> checkGenerationMinimum(const Number& number) {
     return checkGenerationMinimum(number.whole());
 }
 
-std::string fileWriteFailure(const std::string& path, const std::string& reason) {
-    return "The file " + path + " could not be written: " + reason + ".";
-}
-
-std::string fileCreateFailure(const std::string& path, const std::string& reason) {
-    return "The file " + path + " could not be opened for writing: " + reason + ".";
-}
-
 namespace {
 // After a complete run the candidate stands above the limit; the report names the limit.
 std::int64_t reportedBound(const JobResult& r) { return std::min(r.candidate, r.limit); }

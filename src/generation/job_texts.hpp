@@ -17,8 +17,5 @@ inline constexpr std::string_view kMinimumMessage = "Minimum value is 100";
 std::optional<std::string> checkGenerationMinimum(std::int64_t whole);
 std::optional<std::string> checkGenerationMinimum(const Number& number);
 
-// Failure texts: "The file <path> could not be written: <reason>."
-std::string fileWriteFailure(const std::string& path, const std::string& reason);
-std::string fileCreateFailure(const std::string& path, const std::string& reason);
 
 }  // namespace tarn

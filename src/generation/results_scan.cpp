@@ -11,6 +11,7 @@
 #include <optional>
 #include <string_view>
 
+#include "core/file_messages.hpp"
 #include "core/miller_rabin.hpp"
 
 namespace tarn {
@@ -120,7 +121,7 @@ ResultsScan::Outcome readLines(int fd, Scanner& scanner, ResultsScan& scan,
         const ssize_t got = ::read(fd, block.get(), kBlockBytes);
         if (got < 0) {
             if (errno == EINTR) continue;
-            scan.problem = std::strerror(errno);
+            scan.problem = systemReason(errno);
             return ResultsScan::Outcome::Unreadable;
         }
         if (got == 0) break;
@@ -161,13 +162,13 @@ ResultsScan scanResults(const std::string& path, std::int64_t resumePoint, const
     ResultsScan scan;
     const int fd = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
     if (fd < 0) {
-        scan.problem = std::strerror(errno);
+        scan.problem = systemReason(errno);
         return scan;
     }
     const FileCloser closer{fd};
     const off_t size = ::lseek(fd, 0, SEEK_END);
     if (size < 0 || ::lseek(fd, 0, SEEK_SET) != 0) {
-        scan.problem = std::strerror(errno);
+        scan.problem = systemReason(errno);
         return scan;
     }
     scan.fileBytes = static_cast<std::uint64_t>(size);

@@ -9,6 +9,7 @@
 
 #include "core/app_folder.hpp"
 #include "core/entry.hpp"
+#include "core/file_messages.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/file_names.hpp"
 #include "generation/results_scan.hpp"
@@ -76,7 +77,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
         ::truncate(resultsPath.c_str(), static_cast<off_t>(scan.keptBytes)) != 0) {
         ResumeResult result;
         result.status = ResumeResult::Status::Failed;
-        result.message = truncationFailure(resultsPath, std::strerror(errno));
+        result.message = truncationFailure(resultsPath, systemReason(errno));
         result.job.status = JobResult::Status::Failed;
         result.job.error = result.message;
         result.job.resultsPath = resultsPath;

@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "core/app_folder.hpp"
+#include "core/file_messages.hpp"
 #include "core/number.hpp"
 
 namespace tarn {
@@ -19,7 +20,6 @@ namespace {
 
 constexpr std::size_t kStagingSize = 64 * 1024;
 
-std::string systemReason(int err) { return std::generic_category().message(err != 0 ? err : EIO); }
 
 // One output file. Runs of whole records go to the system as they stand; the small pieces
 // that mend bare line ends are gathered first so that they do not cost a write each.
@@ -73,7 +73,7 @@ private:
         return true;
     }
     bool fail(int err) {
-        error_ = "The file " + name_ + " cannot be written: " + systemReason(err) + ".";
+        error_ = fileWriteFailure(name_, systemReason(err));
         return false;
     }
 
@@ -235,8 +235,7 @@ SplitResult Splitter::run(const std::string& resultsPath) {
     if (in.fd < 0) {
         const int err = errno;
         failure_ = err == ENOENT ? "The results file " + resultsPath + " was not found."
-                                 : "The results file " + resultsPath +
-                                       " cannot be read: " + systemReason(err) + ".";
+                                 : fileReadFailure(resultsPath, systemReason(err));
         return {SplitStatus::Failed, 0, failure_};
     }
     if (openNext() != Step::Go) return finish(SplitStatus::Failed);
@@ -254,8 +253,7 @@ SplitResult Splitter::run(const std::string& resultsPath) {
         if (got < 0) {
             // A signal (the command line's Ctrl-C) broke the wait: look at the stop again.
             if (errno == EINTR) continue;
-            failure_ =
-                "The results file " + resultsPath + " cannot be read: " + systemReason(errno) + ".";
+            failure_ = fileReadFailure(resultsPath, systemReason(errno));
             return finish(SplitStatus::Failed);
         }
         if (got == 0) {
