@@ -50,12 +50,19 @@ void expectSound(std::int64_t n) {
     EXPECT_EQ(product, static_cast<std::uint64_t>(n)) << factorizationLine(n, list);
 }
 
-std::vector<std::int64_t> primesFrom(std::int64_t start, int count) {
-    std::vector<std::int64_t> out;
-    for (std::int64_t p = start; static_cast<int>(out.size()) < count; ++p) {
-        if (p > 2 && CheckPrime(p)) out.push_back(p);
-    }
+std::vector<std::uint64_t> primesFrom(std::int64_t start, int count) {
+    std::vector<std::uint64_t> out;
+    for (std::int64_t p = start; static_cast<int>(out.size()) < count; ++p)
+        if (p > 2 && CheckPrime(p)) out.push_back(static_cast<std::uint64_t>(p));
     return out;
+}
+
+// The number made of these prime powers must come back as exactly this list.
+void expectPowers(const FactorList& powers) {
+    std::uint64_t n = 1;
+    for (const FactorEntry& e : powers)
+        for (unsigned i = 0; i < e.exponent; ++i) n *= e.prime;
+    EXPECT_EQ(factors(static_cast<std::int64_t>(n)), powers) << n;
 }
 
 }  // namespace
@@ -79,45 +86,23 @@ TEST(FactorizeNumber, RandomNumbersAcrossTheRange) {
 }
 
 TEST(FactorizeNumber, HardCases) {
-    // The largest primes whose square fits, and primes just past the trial divisors.
+    // Squares of the largest primes whose square fits, and of primes just past the trial
+    // divisors; cubes; a square times a prime; products of two primes near 3e7 and of three near
+    // the cube root; powers of 2.
     int squares = 0;
-    for (std::int64_t p : primesFrom(30369800, 12)) {
-        if (p * p > kUpper) continue;
-        ++squares;
-        EXPECT_EQ(factors(p * p), (FactorList{{std::uint64_t(p), 2}}));
-    }
+    for (std::uint64_t p : primesFrom(30369800, 12))
+        if (p * p <= kUpper) expectPowers({{p, 2}}), ++squares;
     EXPECT_GE(squares, 3);
-    for (std::int64_t p : primesFrom(2040, 6)) {
-        EXPECT_EQ(factors(p * p), (FactorList{{std::uint64_t(p), 2}}));
-        EXPECT_EQ(factors(p * p * p), (FactorList{{std::uint64_t(p), 3}}));
-    }
-    // Cubes of the largest primes whose cube fits, and a square times a prime.
-    for (std::int64_t p : primesFrom(97000, 5)) {
-        if (p * p * p > kUpper) continue;
-        EXPECT_EQ(factors(p * p * p), (FactorList{{std::uint64_t(p), 3}}));
-    }
-    {
-        const auto ps = primesFrom(100000, 2);
-        const std::int64_t n = ps[0] * ps[0] * ps[1];
-        EXPECT_EQ(factors(n), (FactorList{{std::uint64_t(ps[0]), 2}, {std::uint64_t(ps[1]), 1}}));
-    }
-    // Products of two primes near 3e7.
-    const auto low = primesFrom(29000000, 10);
-    const auto high = primesFrom(30000000, 10);
-    for (std::size_t i = 0; i < low.size(); ++i) {
-        EXPECT_EQ(factors(low[i] * high[i]),
-                  (FactorList{{std::uint64_t(low[i]), 1}, {std::uint64_t(high[i]), 1}}));
-    }
-    // Three primes near the cube root of the range.
-    {
-        const auto ps = primesFrom(96000, 3);
-        EXPECT_EQ(factors(ps[0] * ps[1] * ps[2]), (FactorList{{std::uint64_t(ps[0]), 1},
-                                                              {std::uint64_t(ps[1]), 1},
-                                                              {std::uint64_t(ps[2]), 1}}));
-    }
-    for (unsigned k = 1; k < 50; ++k) {
-        EXPECT_EQ(factors(std::int64_t{1} << k), (FactorList{{2, k}}));
-    }
+    for (std::uint64_t p : primesFrom(2040, 6)) expectPowers({{p, 2}}), expectPowers({{p, 3}});
+    for (std::uint64_t p : primesFrom(97000, 5))
+        if (p * p * p <= kUpper) expectPowers({{p, 3}});
+    const auto a = primesFrom(100000, 2);
+    expectPowers({{a[0], 2}, {a[1], 1}});
+    const auto low = primesFrom(29000000, 10), high = primesFrom(30000000, 10);
+    for (std::size_t i = 0; i < low.size(); ++i) expectPowers({{low[i], 1}, {high[i], 1}});
+    const auto b = primesFrom(96000, 3);
+    expectPowers({{b[0], 1}, {b[1], 1}, {b[2], 1}});
+    for (unsigned k = 1; k < 50; ++k) expectPowers({{2, k}});
     for (std::int64_t n = kUpper; n > kUpper - 300; --n) expectSound(n);
     EXPECT_EQ(factors(421053653), (FactorList{{20149, 1}, {20897, 1}}));
     EXPECT_EQ(factors(kUpper), (FactorList{{3, 1}, {47, 1}, {761, 1}, {35527, 1}, {241951, 1}}));
