@@ -7,6 +7,7 @@
 #include <spawn.h>
 #include <sys/wait.h>
 
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -38,10 +39,7 @@ public:
         posix_spawn_file_actions_destroy(&actions);
     }
     ~CliChild() {
-        if (pid_ > 0 && code_ < 0) {
-            ::kill(pid_, SIGKILL);
-            wait();
-        }
+        if (!finished() && ::kill(pid_, SIGKILL) == 0) wait();
     }
     CliChild(const CliChild&) = delete;
     CliChild& operator=(const CliChild&) = delete;
@@ -50,24 +48,23 @@ public:
 
     // The exit code, or 128 + the signal that ended it; -1 when the program did not start.
     int wait() {
-        int status = 0;
-        if (pid_ <= 0 || code_ >= 0) return code_;
-        while (::waitpid(pid_, &status, 0) < 0) {
-        }
-        return code_ = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+        while (!reap(0)) continue;
+        return code_;
     }
     // Whether it has ended, without waiting for it.
-    bool finished() {
-        int status = 0;
-        if (pid_ <= 0 || code_ >= 0) return true;
-        if (::waitpid(pid_, &status, WNOHANG) != pid_) return false;
-        code_ = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
-        return true;
-    }
+    bool finished() { return reap(WNOHANG); }
     std::string out() const { return readFile(outPath_); }
     std::string err() const { return readFile(errPath_); }
 
 private:
+    bool reap(int flags) {
+        int status = 0;
+        if (pid_ <= 0 || code_ >= 0) return true;
+        if (::waitpid(pid_, &status, flags) != pid_) return false;
+        code_ = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+        return true;
+    }
+
     std::string outPath_, errPath_;
     pid_t pid_ = -1;
     int code_ = -1;
@@ -76,7 +73,12 @@ private:
 struct CliRun {
     int code;
     std::string out, err;
+    bool operator==(const CliRun&) const = default;
 };
+inline void PrintTo(const CliRun& run, std::ostream* os) {
+    *os << "exit code " << run.code << ", stdout \"" << run.out << "\", stderr \"" << run.err
+        << '"';
+}
 
 // Runs the program to its end, with `input` on standard input.
 inline CliRun runCli(const std::vector<std::string>& args, const std::string& outputFolder,

@@ -21,33 +21,21 @@ const std::string kRange = "Value out of range. Value must be between 2 and 922 
 
 }  // namespace
 
-TEST(CliNumbers, ArgumentsGiveOneLineEachAndRefusalsGoToStandardError) {
-    const CliRun test = run({"test", "2", "2.7", "9", "1", "abc", "922337203685123"});
-    EXPECT_EQ(test.code, 2);
-    EXPECT_EQ(test.out,
-              "Number 2 is prime.\nNumber 2 is prime.\nNumber 9 is not prime.\n"
-              "Number 922337203685123 is prime.\n");
-    EXPECT_EQ(test.err, kRange + "Invalid entry.\n");
-    const CliRun factorize = run({"factorize", "360", "2.9", "421053653"});
-    EXPECT_EQ(factorize.code, 0);
-    EXPECT_EQ(factorize.out, "360 = 2^3 * 3^2 * 5\n2 = 2\n421053653 = 20149 * 20897\n");
-    EXPECT_EQ(factorize.err, "");
-}
-
-TEST(CliNumbers, StandardInputWhenNoNumbersAreGiven) {
-    std::string input;
-    for (int i = 2; i < 3000; ++i) input += std::to_string(i) + "\n";
-    const CliRun all = run({"factorize"}, input);
-    EXPECT_EQ(all.code, 0);
-    EXPECT_EQ(all.out.substr(0, 36), "2 = 2\n3 = 3\n4 = 2^2\n5 = 5\n6 = 2 * 3\n");
-    EXPECT_NE(all.out.find("\n2048 = 2^11\n2049 = 3 * 683\n"), std::string::npos);
-    // Windows line ends, blank lines, a refused line and a last line without its newline.
-    const CliRun mixed = run({"test"}, "127\r\n\nx\n9\n0\n922337203685277");
-    EXPECT_EQ(mixed.code, 2);
-    EXPECT_EQ(mixed.out,
-              "Number 127 is prime.\nNumber 9 is not prime.\nNumber 922337203685277 is not "
-              "prime.\n");
-    EXPECT_EQ(mixed.err, "Invalid entry.\n" + kRange);
+// Arguments and standard input (Windows line ends, blank lines, a refused line and a last line
+// without its newline): one line each on stdout, refusals on stderr, exit code 2 after a refusal.
+TEST(CliNumbers, OneLineEachOnStdoutRefusalsOnStderr) {
+    EXPECT_EQ(run({"test", "2", "2.7", "9", "1", "abc", "922337203685123"}),
+              (CliRun{2,
+                      "Number 2 is prime.\nNumber 2 is prime.\nNumber 9 is not prime.\n"
+                      "Number 922337203685123 is prime.\n",
+                      kRange + "Invalid entry.\n"}));
+    EXPECT_EQ(run({"factorize", "360", "2.9", "421053653"}),
+              (CliRun{0, "360 = 2^3 * 3^2 * 5\n2 = 2\n421053653 = 20149 * 20897\n", ""}));
+    EXPECT_EQ(run({"test"}, "127\r\n\nx\n9\n0\n922337203685277"),
+              (CliRun{2,
+                      "Number 127 is prime.\nNumber 9 is not prime.\nNumber 922337203685277 is "
+                      "not prime.\n",
+                      "Invalid entry.\n" + kRange}));
 }
 
 TEST(CliNumbers, InterruptEndsTheBatchWithExitCodeThree) {
@@ -60,11 +48,8 @@ TEST(CliNumbers, InterruptEndsTheBatchWithExitCodeThree) {
     std::this_thread::sleep_for(std::chrono::milliseconds(200));
     child.signal(SIGINT);
     EXPECT_EQ(child.wait(), 3);
-    // Whatever was done is there, in whole lines.
+    // Whatever was done is there, in whole lines, and far from all of it.
     const std::string out = child.out();
     EXPECT_LT(out.size(), input.size() * 2);
-    if (!out.empty()) {
-        EXPECT_EQ(out.back(), '\n');
-        EXPECT_EQ(out.substr(0, out.find('\n')), "922335988900189 = 30369979 * 30369991");
-    }
+    EXPECT_TRUE(out.empty() || out.back() == '\n') << out.substr(out.size() - 40);
 }

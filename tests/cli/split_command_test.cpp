@@ -1,19 +1,16 @@
 // tarn-cli split, run as the real program: what the command line adds to the split, its
 // arguments, exit codes and the streams its messages go to.
 #include <gtest/gtest.h>
-#include <signal.h>
 #include <sys/stat.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <csignal>
 #include <cstdio>
 #include <filesystem>
-#include <string>
 
 #include "cli_child.hpp"
 
-using tarn::test::readFile;
+using namespace tarn::test;
 
 namespace {
 
@@ -24,18 +21,13 @@ std::string records(int count) {
 }
 
 struct SplitCommand : ::testing::Test {
-    tarn::test::TempFolder data, into, scratch;
-    std::string out, err;
+    TempFolder data, into, scratch;
 
     // Runs `split --records count` on the data folder's results file into the other folder.
-    int split(const std::string& count) {
-        const tarn::test::CliRun run = tarn::test::runCli(
-            {"--folder", data.path(), "split", "--records", count, "--into",
-             into.path().substr(0, into.path().size() - 1)},
-            scratch.path());
-        out = run.out;
-        err = run.err;
-        return run.code;
+    CliRun split(const std::string& count) {
+        return runCli({"--folder", data.path(), "split", "--records", count, "--into",
+                       into.path().substr(0, into.path().size() - 1)},
+                      scratch.path());
     }
     std::string file(int n) const { return into.path() + "primes" + std::to_string(n) + ".txt"; }
 };
@@ -43,19 +35,12 @@ struct SplitCommand : ::testing::Test {
 }  // namespace
 
 TEST_F(SplitCommand, ExitCodesAndStreams) {
-    EXPECT_EQ(split("1000"), 1);
-    EXPECT_EQ(err, "The results file " + data.path() + "primes.txt was not found.\n");
-    EXPECT_EQ(out, "");
-
-    tarn::test::writeFile(data.path() + "primes.txt", records(2500));
-    EXPECT_EQ(split("999.9"), 2);
-    EXPECT_EQ(err, "Minimum value is 1000 records.\n");
-    EXPECT_EQ(out, "");
+    const std::string missing = "The results file " + data.path() + "primes.txt was not found.\n";
+    EXPECT_EQ(split("1000"), (CliRun{1, "", missing}));
+    writeFile(data.path() + "primes.txt", records(2500));
+    EXPECT_EQ(split("999.9"), (CliRun{2, "", "Minimum value is 1000 records.\n"}));
     EXPECT_FALSE(std::filesystem::exists(file(1)));
-
-    EXPECT_EQ(split("1000.9"), 0) << err;
-    EXPECT_EQ(out, "Done!!! 3 files were created.\n");
-    EXPECT_EQ(err, "");
+    EXPECT_EQ(split("1000.9"), (CliRun{0, "Done!!! 3 files were created.\n", ""}));
     EXPECT_EQ(readFile(file(1)) + readFile(file(2)) + readFile(file(3)), records(2500));
 }
 
@@ -64,9 +49,8 @@ TEST_F(SplitCommand, CtrlCStopsBetweenRecordsWithExitCodeThree) {
     // waiting for more records, when the interrupt comes.
     const std::string results = data.path() + "primes.txt";
     ASSERT_EQ(mkfifo(results.c_str(), 0600), 0);
-    tarn::test::CliChild child(
-        {"--folder", data.path(), "split", "--records", "1000", "--into", into.path()},
-        scratch.path());
+    CliChild child({"--folder", data.path(), "split", "--records", "1000", "--into", into.path()},
+                   scratch.path());
     const auto oldPipeAction = std::signal(SIGPIPE, SIG_IGN);
     std::FILE* feed = std::fopen(results.c_str(), "w");  // waits for the reader
     bool done = false;

@@ -3,6 +3,9 @@
 // out by hand. Tests craft stopped jobs with it and compare finished files byte for byte.
 #pragma once
 
+#include <gtest/gtest.h>
+
+#include <algorithm>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -45,6 +48,16 @@ inline std::string oracleCheckpoint(std::int64_t candidate, std::int64_t limit, 
 // A job that ran to its end leaves as candidate the first turn start (30k + 11) above its limit.
 inline std::string completeCheckpoint(std::int64_t limit) {
     return oracleCheckpoint(limit - (limit - 11) % 30 + 30, limit, 0);
+}
+
+// Equal texts, or a short account of where they part: gtest's own line diff of two files this
+// large would take memory quadratic in their line counts.
+inline testing::AssertionResult sameText(const std::string& got, const std::string& expected) {
+    if (got == expected) return testing::AssertionSuccess();
+    return testing::AssertionFailure()
+           << got.size() << " bytes instead of " << expected.size() << ", parting at byte "
+           << std::mismatch(got.begin(), got.end(), expected.begin(), expected.end()).first -
+                  got.begin();
 }
 
 }  // namespace tarn::test

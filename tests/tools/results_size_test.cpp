@@ -1,33 +1,25 @@
 // The megabyte figure and question shown before a large results file is opened.
-#include <gtest/gtest.h>
-
 #include "tools/results_size.hpp"
+
+#include <gtest/gtest.h>
 
 using namespace tarn;
 
-TEST(ResultsSize, FigureIsCutToTwoDecimals) {
+TEST(ResultsSize, FigureIsCutToTwoDecimalsAndExactBeyondFourGigabytes) {
     struct Case {
         std::uint64_t bytes;
         const char* text;
         bool large;
     };
-    for (const Case& c : {Case{10485760, "10", false}, Case{10496245, "10", false},
-                          Case{10496246, "10.01", true}, Case{11000000, "10.49", true},
-                          Case{15728640, "15", true}, Case{12582911, "11.99", true},
-                          Case{0, "0", false}, Case{11010048, "10.5", true}}) {
+    for (const Case& c :
+         {Case{10485760, "10", false}, Case{10496245, "10", false}, Case{10496246, "10.01", true},
+          Case{11000000, "10.49", true}, Case{15728640, "15", true}, Case{12582911, "11.99", true},
+          Case{0, "0", false}, Case{11010048, "10.5", true}, Case{5ULL << 30, "5120", true},
+          Case{(5ULL << 30) + 10485, "5120", true}, Case{(5ULL << 30) + 10486, "5120.01", true}}) {
         const double figure = sizeFigure(c.bytes);
         EXPECT_EQ(megabyteText(figure), c.text) << c.bytes;
         EXPECT_EQ(isLargeFigure(figure), c.large) << c.bytes;
     }
-}
-
-TEST(ResultsSize, FilesBeyondFourGigabytesAreMeasuredExactly) {
-    EXPECT_EQ(megabyteText(sizeFigure(5ULL << 30)), "5120");
-    EXPECT_EQ(megabyteText(sizeFigure((5ULL << 30) + 10485)), "5120");
-    EXPECT_EQ(megabyteText(sizeFigure((5ULL << 30) + 10486)), "5120.01");
-}
-
-TEST(ResultsSize, QuestionText) {
     EXPECT_EQ(largeFileQuestion(sizeFigure(12582911)),
               "The file is bigger than 10 MB (11.99 MB). Do you still want to open it with "
               "Notepad? If you cancel, you may choose the program to open it.");
