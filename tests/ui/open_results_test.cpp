@@ -1,4 +1,4 @@
-// "Show results" and the offer to open the file after a job, through the fake shell.
+// "Show results": the text editor, or for a large file a question first, through the fake shell.
 #include <filesystem>
 
 #include "window_fixture.hpp"
@@ -19,7 +19,7 @@ TEST_F(WindowTest, ShowResultsOpensTheFileOrAsksAboutALargeOne) {
     EXPECT_EQ(shell.edited, std::vector<std::string>{path});
 
     std::filesystem::resize_file(path, 10496246);
-    messages.setNextAnswer(ui::MessageBox::Answer::Cancel);
+    messages.answers.push_back(ui::MessageBox::Answer::Cancel);
     window->show_Click();
     ASSERT_EQ(messages.shown.size(), 1u);
     EXPECT_EQ(messages.last().text,
