@@ -1,8 +1,8 @@
 // Recording stand-ins for the message box and the platform shell.
 #pragma once
 
-#include <deque>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "ui/message_box.hpp"
@@ -17,18 +17,14 @@ public:
         Buttons buttons;
     };
 
-    // Unanswered questions get OK.
     Answer show(const std::string& text, const std::string& title, Buttons buttons) override {
         shown.push_back({text, title, buttons});
-        if (answers.empty()) return Answer::Ok;
-        const Answer a = answers.front();
-        answers.pop_front();
-        return a;
+        return std::exchange(nextAnswer, Answer::Ok);
     }
     const Shown& last() const { return shown.back(); }
 
     std::vector<Shown> shown;
-    std::deque<Answer> answers;  // the answers to the next questions
+    Answer nextAnswer = Answer::Ok;  // the answer to the next question; the later ones get OK
 };
 
 class FakeShell final : public ui::Shell {

@@ -16,9 +16,9 @@ namespace tarn::test {
 class WindowTest : public ::testing::Test {
 protected:
     void SetUp() override { window = std::make_unique<ui::Form1>(messages, shell, dir.path()); }
+    // Let a worker that a test left running finish before the window goes.
     void TearDown() override {
-        // Let a worker that a test left running finish before the window goes.
-        waitUntil([&] { return !window->jobRunning() && !window->numberCommandRunning(); });
+        idle();
         window.reset();
     }
 
@@ -28,6 +28,14 @@ protected:
     template <typename Condition>
     static bool waitUntil(Condition condition) {
         return QTest::qWaitFor(condition, 20000);
+    }
+    bool idle() {
+        return waitUntil([&] { return !window->jobRunning() && !window->numberCommandRunning(); });
+    }
+    // Presses a button and waits for the worker it starts.
+    void press(QPushButton* button) {
+        button->click();
+        ASSERT_TRUE(idle());
     }
 
     TempFolder dir;
