@@ -73,7 +73,7 @@ TEST_F(WindowTest, OpensInItsDesignedState) {
 
 TEST_F(WindowTest, ShownItTabsInTheDesignedOrderAndLooksAsDesigned) {
     window->show();
-    ASSERT_TRUE(waitUntil([&] { return window->isVisible(); }));
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(window.get()));
     const std::vector<QWidget*> order = {c().Text1,    c().Command1, c().Text2,  c().Command2,
                                          c().Command4, c().Check1,   c().Check2, c().Command5,
                                          c().Command3, c().Command6, c().Text4,  c().Text1};

@@ -24,13 +24,10 @@ protected:
 
     Ui::Form1& c() { return window->controls(); }
 
-    // Runs the event loop until the condition holds (or a generous deadline passes).
-    template <typename Condition>
-    static bool waitUntil(Condition condition) {
-        return QTest::qWaitFor(condition, 20000);
-    }
+    // Runs the event loop until no worker is left (or a generous deadline passes).
     bool idle() {
-        return waitUntil([&] { return !window->jobRunning() && !window->numberCommandRunning(); });
+        return QTest::qWaitFor(
+            [&] { return !window->jobRunning() && !window->numberCommandRunning(); }, 20000);
     }
     // Presses a button and waits for the worker it starts.
     void press(QPushButton* button) {
