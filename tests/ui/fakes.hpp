@@ -1,8 +1,8 @@
 // Recording stand-ins for the message box and the platform shell.
 #pragma once
 
-#include <deque>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "ui/message_box.hpp"
@@ -19,38 +19,30 @@ public:
 
     Answer show(const std::string& text, const std::string& title, Buttons buttons) override {
         shown.push_back({text, title, buttons});
-        if (answers.empty()) return Answer::Ok;
-        const Answer a = answers.front();
-        answers.pop_front();
-        return a;
+        return std::exchange(nextAnswer, Answer::Ok);
     }
-    // The answer to the next question; unanswered questions get OK.
-    void setNextAnswer(Answer a) { answers.push_back(a); }
     const Shown& last() const { return shown.back(); }
 
     std::vector<Shown> shown;
-    std::deque<Answer> answers;
+    Answer nextAnswer = Answer::Ok;  // the answer to the next question; the later ones get OK
 };
 
 class FakeShell final : public ui::Shell {
 public:
-    std::string openInTextEditor(const std::string& path) override {
-        edited.push_back(path);
-        return failure;
-    }
-    std::string showOpenWith(const std::string& path) override {
-        openedWith.push_back(path);
-        return failure;
-    }
-    std::string openUrl(const std::string& url) override {
-        urls.push_back(url);
-        return failure;
-    }
+    std::string openInTextEditor(const std::string& path) override { return note(edited, path); }
+    std::string showOpenWith(const std::string& path) override { return note(openedWith, path); }
+    std::string openUrl(const std::string& url) override { return note(urls, url); }
     std::string documentsFolder() override { return documents; }
 
     std::vector<std::string> edited, openedWith, urls;
     std::string documents = "/tmp";
     std::string failure;  // what every launch answers; empty for success
+
+private:
+    std::string note(std::vector<std::string>& calls, const std::string& argument) {
+        calls.push_back(argument);
+        return failure;
+    }
 };
 
 }  // namespace tarn::test

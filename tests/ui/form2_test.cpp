@@ -92,11 +92,26 @@ TEST_F(Form2Test, IsBuiltAsDesigned) {
         do w = w->nextInFocusChain();
         while (!(w->focusPolicy() & Qt::TabFocus));
     }
+    std::filesystem::create_directories(std::string(TARN_SCREENSHOT_DIR));
+    form->show();
+    ASSERT_TRUE(QTest::qWaitForWindowExposed(form.data()));
+    EXPECT_TRUE(form->grab().save(QString::fromLatin1(TARN_SCREENSHOT_DIR) + "/form2.png"));
 }
 
-TEST_F(Form2Test, SplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
+TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
+    test::writeFile(program.path() + "primes.txt", records(2500));
+    jobRunning = true;  // a job writes the results file
+    split("1000");
+    EXPECT_EQ(messages.last().text, ui::kSplitWhileJobMessage);
+    jobRunning = false;
+    split("999.9");
+    ASSERT_EQ(messages.shown.size(), 2u);
+    EXPECT_EQ(messages.last().text, "Minimum value is 1000 records.");
+    EXPECT_EQ(messages.last().title, "Info");
+    EXPECT_EQ(text("Command2"), "Close");
+    EXPECT_EQ(files(shell.documents), 0);
+
     auto* dir1 = qobject_cast<ui::FolderList*>(child("Dir1"));
-    EXPECT_EQ(dir1->path().toStdString(), shell.documents);
     EXPECT_EQ(text("Label1"), shell.documents);
     const auto found = dir1->findItems("Pictures", Qt::MatchExactly | Qt::MatchRecursive);
     ASSERT_EQ(found.size(), 1);
@@ -107,42 +122,21 @@ TEST_F(Form2Test, SplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
     EXPECT_EQ(text("Label1"), pictures);
 
     QSignalSpy finished(form.data(), &Form2::splitFinished);
-    split("1000");
-    ASSERT_TRUE(finished.wait(10000));
-    EXPECT_EQ(messages.last().text,
-              "The results file " + program.path() + "primes.txt was not found.");
-    EXPECT_EQ(text("Command2"), "Close");
-
-    test::writeFile(program.path() + "primes.txt", records(2500));
     split("1000.9");
     EXPECT_EQ(text("Command2"), "Cancel");
     ASSERT_TRUE(finished.wait(10000));
-    ASSERT_EQ(messages.shown.size(), 2u);
+    ASSERT_EQ(messages.shown.size(), 3u);
     EXPECT_EQ(messages.last().text, "Done!!! 3 files were created.");
     EXPECT_EQ(messages.last().title, "Info");
     EXPECT_EQ(text("Command2"), "Close");
     EXPECT_EQ(files(pictures), 3);
-    EXPECT_EQ(test::readFile(pictures + "/primes3.txt"),
-              records(2500).substr(records(2000).size()));
     EXPECT_TRUE(form) << "a split that ends by itself leaves the window open";
-}
 
-TEST_F(Form2Test, RefusalsTouchNoFileAndLeaveClose) {
-    test::writeFile(program.path() + "primes.txt", records(2500));
-    const std::pair<const char*, std::string> cases[] = {
-        {"999.9", "Minimum value is 1000 records."},
-        {"abc", "Invalid entry."},
-        {"1000", ui::kSplitWhileJobMessage}};  // while a job writes the results file
-    std::size_t shown = 0;
-    for (const auto& [count, message] : cases) {
-        jobRunning = message == ui::kSplitWhileJobMessage;
-        split(count);
-        ASSERT_EQ(messages.shown.size(), ++shown) << count;
-        EXPECT_EQ(messages.last().text, message) << count;
-        EXPECT_EQ(messages.last().title, "Info");
-        EXPECT_EQ(text("Command2"), "Close");
-    }
-    EXPECT_EQ(files(shell.documents), 0);
+    std::filesystem::remove(program.path() + "primes.txt");
+    split("1000");
+    ASSERT_TRUE(finished.wait(10000));
+    EXPECT_EQ(messages.last().text,
+              "The results file " + program.path() + "primes.txt was not found.");
 }
 
 class Form2StopTest : public Form2Test, public ::testing::WithParamInterface<bool> {};
@@ -190,10 +184,3 @@ TEST_P(Form2StopTest, ClosingDuringASplitStopsIt) {
 }
 
 INSTANTIATE_TEST_SUITE_P(CancelOrTitleBar, Form2StopTest, ::testing::Bool());
-
-TEST_F(Form2Test, ScreenshotShowsEveryControlWhole) {
-    std::filesystem::create_directories(std::string(TARN_SCREENSHOT_DIR));
-    form->show();
-    ASSERT_TRUE(QTest::qWaitForWindowExposed(form.data()));
-    EXPECT_TRUE(form->grab().save(QString::fromLatin1(TARN_SCREENSHOT_DIR) + "/form2.png"));
-}

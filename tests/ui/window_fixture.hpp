@@ -3,50 +3,36 @@
 
 #include <gtest/gtest.h>
 
-#include <QCoreApplication>
-#include <QDeadlineTimer>
-#include <QDir>
-#include <QImage>
-#include <QPixmap>
-#include <QSignalSpy>
+#include <QTest>
 #include <memory>
 
 #include "fakes.hpp"
 #include "support/temp_folder.hpp"
 #include "ui/form1.hpp"
-#include "ui_form1.h"
+#include "ui_form1.h"  // with the classes of the controls
 
 namespace tarn::test {
 
 class WindowTest : public ::testing::Test {
 protected:
-    void SetUp() override {
-        window = std::make_unique<ui::Form1>(messages, shell, dir.path());
-    }
+    void SetUp() override { window = std::make_unique<ui::Form1>(messages, shell, dir.path()); }
+    // Let a worker that a test left running finish before the window goes.
     void TearDown() override {
-        // Let a worker that a test left running finish before the window goes.
-        waitUntil([&] { return !window->jobRunning() && !window->numberCommandRunning(); });
+        idle();
         window.reset();
     }
 
     Ui::Form1& c() { return window->controls(); }
 
-    // Runs the event loop until the condition holds (or a generous deadline passes).
-    template <typename Condition>
-    static bool waitUntil(Condition condition, int milliseconds = 20000) {
-        QDeadlineTimer deadline(milliseconds);
-        while (!condition()) {
-            if (deadline.hasExpired()) return false;
-            QCoreApplication::processEvents(QEventLoop::AllEvents, 10);
-        }
-        return true;
+    // Runs the event loop until no worker is left (or a generous deadline passes).
+    bool idle() {
+        return QTest::qWaitFor(
+            [&] { return !window->jobRunning() && !window->numberCommandRunning(); }, 20000);
     }
-
-    static void saveScreenshot(QWidget& w, const QString& name) {
-        QDir().mkpath(TARN_SCREENSHOT_DIR);
-        const QPixmap shot = w.grab();
-        ASSERT_FALSE(shot.isNull());
-        ASSERT_TRUE(shot.save(QString(TARN_SCREENSHOT_DIR) + "/" + name));
+    // Presses a button and waits for the worker it starts.
+    void press(QPushButton* button) {
+        button->click();
+        ASSERT_TRUE(idle());
     }
 
     TempFolder dir;

@@ -1,4 +1,5 @@
-// "Show results" and the offer to open the file after a job, through the fake shell.
+// What the main window hands to the shell: the read-me, the web link and the results file (for
+// a large one after a question).
 #include <filesystem>
 
 #include "window_fixture.hpp"
@@ -19,7 +20,7 @@ TEST_F(WindowTest, ShowResultsOpensTheFileOrAsksAboutALargeOne) {
     EXPECT_EQ(shell.edited, std::vector<std::string>{path});
 
     std::filesystem::resize_file(path, 10496246);
-    messages.setNextAnswer(ui::MessageBox::Answer::Cancel);
+    messages.nextAnswer = ui::MessageBox::Answer::Cancel;
     window->show_Click();
     ASSERT_EQ(messages.shown.size(), 1u);
     EXPECT_EQ(messages.last().text,
@@ -35,4 +36,32 @@ TEST_F(WindowTest, ShowResultsOpensTheFileOrAsksAboutALargeOne) {
     window->show_Click();
     EXPECT_EQ(messages.last().text, shell.failure);
     EXPECT_EQ(messages.last().title, "Info");
+}
+
+TEST_F(WindowTest, ReadmeAndTheWebLinkGoToTheShell) {
+    shell.failure = "no editor";
+    window->readme_Click();  // no README.txt: nothing at all
+    EXPECT_TRUE(shell.edited.empty());
+    EXPECT_TRUE(messages.shown.empty());
+
+    writeFile(dir.path() + "README.txt", "Tarn\r\n");
+    window->readme_Click();
+    EXPECT_EQ(shell.edited, std::vector<std::string>{dir.path() + "README.txt"});
+    ASSERT_EQ(messages.shown.size(), 1u);
+    EXPECT_EQ(messages.last().text, "no editor");
+    EXPECT_EQ(messages.last().title, "Info");
+
+    // An installed copy opens the installed read-me, and only that one.
+    TempFolder doc;
+    shell.failure.clear();
+    window->setReadmePath(doc.path() + "README.txt");
+    window->readme_Click();
+    writeFile(doc.path() + "README.txt", "installed\n");
+    window->readme_Click();
+    ASSERT_EQ(shell.edited.size(), 2u);
+    EXPECT_EQ(shell.edited[1], doc.path() + "README.txt");
+
+    c().Command4->click();
+    EXPECT_EQ(shell.urls, std::vector<std::string>{"https://brindle.example"});
+    EXPECT_EQ(messages.shown.size(), 1u);
 }
