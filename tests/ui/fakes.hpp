@@ -21,7 +21,11 @@ public:
         shown.push_back({text, title, buttons});
         return std::exchange(nextAnswer, Answer::Ok);
     }
-    const Shown& last() const { return shown.back(); }
+    // An empty message when none was shown, so that a check fails instead of the test program.
+    const Shown& last() const {
+        static const Shown none{};
+        return shown.empty() ? none : shown.back();
+    }
 
     std::vector<Shown> shown;
     Answer nextAnswer = Answer::Ok;  // the answer to the next question; the later ones get OK

@@ -16,8 +16,9 @@ namespace tarn::test {
 class WindowTest : public ::testing::Test {
 protected:
     void SetUp() override { window = std::make_unique<ui::Form1>(messages, shell, dir.path()); }
-    // Let a worker that a test left running finish before the window goes.
+    // Stop any worker that a test left running, and let it finish before the window goes.
     void TearDown() override {
+        if (!idle()) c().Command5->click();
         idle();
         window.reset();
     }
