@@ -81,6 +81,7 @@ private:
     void startJobDisplay(std::int64_t limit, std::int64_t position);
     void refreshJobDisplay();
     void finishJob(const JobResult& result);
+    void endJob();
     bool refuseWhileJobRuns();
     void requestClose();
 

@@ -78,29 +78,21 @@ void Form1::Command3_Click() {
     runOnWorker(
         this, [this, events] { return runResume(folder_, jobStop_, &jobProgress_, events); },
         [this](const ResumeResult& result) {
+            JobResult job = result.job;
             switch (result.status) {
                 case ResumeResult::Status::NothingToResume:
-                    jobRunning_ = false;
-                    Q_EMIT jobFinished();
-                    if (closingRequested_) close();
+                    endJob();
                     return;
                 case ResumeResult::Status::Refused:
-                    jobRunning_ = false;
-                    if (!closingRequested_)
-                        messages_.show(result.message, std::string(kInfoTitle));
-                    Q_EMIT jobFinished();
-                    if (closingRequested_) close();
-                    return;
-                default: {
-                    // A resume can fail before its job starts (cutting the file back).
-                    JobResult job = result.job;
-                    if (result.status == ResumeResult::Status::Failed) {
-                        job.status = JobResult::Status::Failed;
-                        job.error = result.message;
-                    }
-                    finishJob(job);
-                }
+                case ResumeResult::Status::Failed:
+                    // Told before a job started, or while the file was cut back: an "Info" text.
+                    job.status = JobResult::Status::Failed;
+                    job.error = result.message;
+                    break;
+                default:
+                    break;
             }
+            finishJob(job);
         });
 }
 
@@ -128,7 +120,7 @@ void Form1::finishJob(const JobResult& result) {
     // A resume that ends while reading the file never showed any progress.
     if (progressTimer_.isActive()) refreshJobDisplay();
     progressTimer_.stop();
-    jobRunning_ = false;
+    jobRunning_ = false;  // before any message: the job's files are free again
     if (!closingRequested_) {
         switch (result.status) {
             case JobResult::Status::Failed:
@@ -145,6 +137,11 @@ void Form1::finishJob(const JobResult& result) {
                 break;
         }
     }
+    endJob();
+}
+
+void Form1::endJob() {
+    jobRunning_ = false;
     Q_EMIT jobFinished();
     if (closingRequested_) close();
 }
