@@ -4,6 +4,7 @@
 #include "cli/cli_context.hpp"
 #include "core/app_folder.hpp"
 #include "core/data_folder.hpp"
+#include "core/exception_text.hpp"
 
 int main(int argc, char** argv) {
     tarn::StopSignal stop;
@@ -20,8 +21,8 @@ int main(int argc, char** argv) {
         ->check(CLI::ExistingDirectory)
         ->default_str(tarn::chooseDataFolder(programFolder, tarn::currentSurroundings()));
     app.parse_complete_callback([&] {
-        ctx.folder = folder.empty() ? tarn::dataFolder(programFolder)
-                                    : tarn::withTrailingSeparator(folder);
+        ctx.folder =
+            folder.empty() ? tarn::dataFolder(programFolder) : tarn::withTrailingSeparator(folder);
     });
 
     tarn::cli::registerNumberCommands(app, ctx);
@@ -35,6 +36,10 @@ int main(int argc, char** argv) {
     } catch (const CLI::ParseError& e) {
         const int code = app.exit(e);
         return code == 0 ? 0 : tarn::cli::kRefused;
+    } catch (...) {
+        // The engines report their own failures; this is the last line for anything else.
+        std::cerr << tarn::unexpectedFailure(tarn::describeCurrentException()) << '\n';
+        return tarn::cli::kIoFailure;
     }
     if (argc == 1) {
         std::cout << app.help();

@@ -16,10 +16,10 @@ namespace {
 
 // One number as the reader takes it: blanks and line ends before it are skipped; it ends at a
 // blank, a comma or the end of a line.
-std::optional<std::int64_t> nextNumber(const std::string& text, std::size_t& pos,
-                                       std::int64_t low, std::int64_t high) {
-    while (pos < text.size() && (text[pos] == ' ' || text[pos] == '\t' || text[pos] == '\r' ||
-                                 text[pos] == '\n'))
+std::optional<std::int64_t> nextNumber(const std::string& text, std::size_t& pos, std::int64_t low,
+                                       std::int64_t high) {
+    while (pos < text.size() &&
+           (text[pos] == ' ' || text[pos] == '\t' || text[pos] == '\r' || text[pos] == '\n'))
         ++pos;
     bool negative = false;
     if (pos < text.size() && (text[pos] == '-' || text[pos] == '+')) negative = text[pos++] == '-';
@@ -38,6 +38,18 @@ std::optional<std::int64_t> nextNumber(const std::string& text, std::size_t& pos
     if (negative) value = -value;
     if (value < low || value > high) return std::nullopt;
     return static_cast<std::int64_t>(value);
+}
+
+// Makes a rename in the folder durable; a file system that cannot sync folders (EINVAL) has
+// nothing more to do.
+int syncFolderOf(const std::string& path) {
+    const std::size_t slash = path.rfind('/');
+    const std::string folder = slash == std::string::npos ? "." : path.substr(0, slash + 1);
+    const int fd = ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+    if (fd < 0) return errno;
+    int error = ::fsync(fd) == 0 || errno == EINVAL ? 0 : errno;
+    ::close(fd);
+    return error;
 }
 
 }  // namespace
@@ -83,6 +95,7 @@ std::string writeCheckpoint(const std::string& path, const Checkpoint& checkpoin
         ::unlink(temporary.c_str());
         return systemReason(error);
     }
+    if (error = syncFolderOf(path); error != 0) return systemReason(error);
     return {};
 }
 

@@ -59,6 +59,9 @@ struct JobHooks {
     // Runs after each checkpoint rewritten during the job, with the results bytes it covers
     // (all of them flushed to the disk before the checkpoint was written).
     std::function<void(const Checkpoint& checkpoint, std::uint64_t durableBytes)> afterCheckpoint;
+    // Writes the checkpoint in place of writeCheckpoint (tests fail it); same contract.
+    std::function<std::string(const std::string& path, const Checkpoint& checkpoint)>
+        writeCheckpoint;
     std::chrono::milliseconds checkpointInterval{2000};
     std::int64_t turnsPerBatch = 0;  // 0: sized for the first-level cache
     std::size_t bufferBytes = 0;     // 0: 4 MiB per write

@@ -1,6 +1,7 @@
 #include "generation/results_sink.hpp"
 
 #include <fcntl.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -10,7 +11,7 @@ namespace {
 
 class FileSink final : public ResultsSink {
 public:
-    explicit FileSink(int fd) : fd_(fd) {}
+    FileSink(int fd, std::uint64_t size) : fd_(fd), size_(size) {}
     ~FileSink() override {
         if (fd_ >= 0) ::close(fd_);
     }
@@ -25,6 +26,7 @@ public:
             }
             if (n == 0) return ENOSPC;
             written += static_cast<std::size_t>(n);
+            size_ += static_cast<std::uint64_t>(n);
         }
         return 0;
     }
@@ -43,6 +45,7 @@ public:
 
     int truncate(std::uint64_t size) override {
         if (::ftruncate(fd_, static_cast<off_t>(size)) != 0) return errno;
+        size_ = size;
         return ::lseek(fd_, static_cast<off_t>(size), SEEK_SET) < 0 ? errno : 0;
     }
 
@@ -52,8 +55,11 @@ public:
         return ::close(fd) == 0 ? 0 : errno;
     }
 
+    std::uint64_t size() const override { return size_; }
+
 private:
     int fd_;
+    std::uint64_t size_;
 };
 
 }  // namespace
@@ -65,8 +71,14 @@ std::unique_ptr<ResultsSink> openResultsFile(const std::string& path, bool appen
         error = errno;
         return nullptr;
     }
+    struct stat info {};
+    if (::fstat(fd, &info) != 0) {
+        error = errno;
+        ::close(fd);
+        return nullptr;
+    }
     error = 0;
-    return std::make_unique<FileSink>(fd);
+    return std::make_unique<FileSink>(fd, static_cast<std::uint64_t>(info.st_size));
 }
 
 }  // namespace tarn

@@ -1,6 +1,8 @@
 // Where the generation job puts its records: the results file, or a stand-in that tests make fail
 // at a chosen byte. Every call returns 0 or the system's error number. write() and sync() may run
 // on different threads at once (the writer and the checkpointer), as they can on one descriptor.
+// The sink keeps the file's size itself, so that a job that continues a file knows where each of
+// its bytes lands and a failed job can cut the file back without dropping earlier records.
 #pragma once
 
 #include <cstddef>
@@ -23,6 +25,9 @@ public:
     // Cuts the file back to `size` bytes (used to drop a torn record after a failed write).
     virtual int truncate(std::uint64_t size) = 0;
     virtual int close() = 0;
+    // The bytes in the file: those it held when opened, plus those written, as cut back.
+    // Called by the writer only, or once the writer has finished.
+    virtual std::uint64_t size() const = 0;
 };
 
 // Opens the results file for writing: truncated for a fresh job, positioned at its end for

@@ -9,6 +9,7 @@
 
 #include "core/app_folder.hpp"
 #include "core/entry.hpp"
+#include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/file_names.hpp"
@@ -37,10 +38,31 @@ ResumeResult stoppedWhileGathering(const std::string& resultsPath, std::int64_t 
     return result;
 }
 
+ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
+                    const ResumeEvents& events, const JobHooks& hooks);
+
 }  // namespace
 
 ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
                        const ResumeEvents& events, const JobHooks& hooks) {
+    try {
+        return resume(folder, stop, progress, events, hooks);
+    } catch (...) {
+        // Reading and checking change no file, and the job guards its own writes.
+        ResumeResult result;
+        result.status = ResumeResult::Status::Failed;
+        result.message = unexpectedFailure(describeCurrentException());
+        result.job.status = JobResult::Status::Failed;
+        result.job.error = result.message;
+        result.job.resultsPath = folder + kResultsFileName;
+        return result;
+    }
+}
+
+namespace {
+
+ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
+                    const ResumeEvents& events, const JobHooks& hooks) {
     const std::string checkpointPath = folder + kCheckpointFileName;
     const std::string resultsPath = folder + kResultsFileName;
 
@@ -111,5 +133,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
     }
     return result;
 }
+
+}  // namespace
 
 }  // namespace tarn

@@ -1,0 +1,177 @@
+#include "generation/write_pipeline.hpp"
+
+#include "core/exception_text.hpp"
+
+namespace tarn {
+
+std::string saveCheckpoint(const JobHooks& hooks, const std::string& path,
+                           const Checkpoint& checkpoint) {
+    return hooks.writeCheckpoint ? hooks.writeCheckpoint(path, checkpoint)
+                                 : writeCheckpoint(path, checkpoint);
+}
+
+WritePipeline::WritePipeline(ResultsSink& sink, const JobHooks& hooks, std::string checkpointPath,
+                             std::int64_t limit, std::size_t bufferBytes, FileMark start,
+                             JobProgress* progress)
+    : sink_(sink),
+      hooks_(hooks),
+      checkpointPath_(std::move(checkpointPath)),
+      limit_(limit),
+      progress_(progress),
+      written_(start),
+      durable_(start) {
+    for (RecordBuffer& b : buffers_) {
+        b.bytes.resize(bufferBytes);
+        free_.push_back(&b);
+    }
+}
+
+WritePipeline::~WritePipeline() { finish(); }
+
+void WritePipeline::start() {
+    writer_ = std::thread([this] { writeLoop(); });
+    if (hooks_.durable) {
+        try {
+            checkpointer_ = std::thread([this] { checkpointLoop(); });
+        } catch (...) {
+            fail({PipelineFailure::Kind::Internal, 0, describeCurrentException()});
+            throw;
+        }
+    }
+}
+
+RecordBuffer* WritePipeline::take() {
+    std::unique_lock lock(mutex_);
+    changed_.wait(lock, [this] { return !free_.empty(); });
+    RecordBuffer* b = free_.front();
+    free_.pop_front();
+    return b;
+}
+
+void WritePipeline::hand(RecordBuffer* buffer) {
+    {
+        std::lock_guard lock(mutex_);
+        full_.push_back(buffer);
+    }
+    changed_.notify_all();
+}
+
+void WritePipeline::finish() {
+    {
+        std::lock_guard lock(mutex_);
+        producerDone_ = true;
+    }
+    changed_.notify_all();
+    if (writer_.joinable()) writer_.join();
+    if (checkpointer_.joinable()) checkpointer_.join();
+}
+
+void WritePipeline::fail(PipelineFailure failure) {
+    {
+        std::lock_guard lock(mutex_);
+        if (failure_.kind == PipelineFailure::Kind::None) failure_ = std::move(failure);
+        failed_.store(true, std::memory_order_release);
+    }
+    changed_.notify_all();
+}
+
+void WritePipeline::release(RecordBuffer* buffer) {
+    {
+        std::lock_guard lock(mutex_);
+        free_.push_back(buffer);
+    }
+    changed_.notify_all();
+}
+
+void WritePipeline::writeLoop() {
+    for (;;) {
+        RecordBuffer* b = nullptr;
+        {
+            std::unique_lock lock(mutex_);
+            changed_.wait(lock, [this] { return !full_.empty() || producerDone_; });
+            if (full_.empty()) break;
+            b = full_.front();
+            full_.pop_front();
+        }
+        if (!failed()) {
+            try {
+                writeOne(*b);
+            } catch (...) {
+                fail({PipelineFailure::Kind::Internal, 0, describeCurrentException()});
+            }
+        }
+        release(b);
+    }
+    {
+        std::lock_guard lock(mutex_);
+        writerDone_ = true;
+    }
+    changed_.notify_all();
+}
+
+void WritePipeline::writeOne(RecordBuffer& b) {
+    if (b.size != 0) {
+        const std::uint64_t offset = sink_.size();
+        std::size_t reached = 0;
+        if (const int error = sink_.write(b.bytes.data(), b.size, reached); error != 0) {
+            fail({PipelineFailure::Kind::Write, error, {}});
+            return;
+        }
+        if (hooks_.durable) sink_.startWriteback(offset, b.size);
+    }
+    {
+        std::lock_guard lock(mutex_);
+        written_ = {sink_.size(), b.lastCandidate, b.primeCount};
+    }
+    changed_.notify_all();
+    if (progress_) progress_->primeCount.store(b.primeCount, std::memory_order_relaxed);
+}
+
+void WritePipeline::checkpointLoop() {
+    // The first flush comes as soon as there is something written: the seed records.
+    auto lastFlush = std::chrono::steady_clock::now() - hooks_.checkpointInterval;
+    try {
+        while (checkpointOnce(lastFlush)) {
+        }
+    } catch (...) {
+        fail({PipelineFailure::Kind::Internal, 0, describeCurrentException()});
+    }
+}
+
+// Waits until new records are due for a flush; returns false once there will be none.
+bool WritePipeline::checkpointOnce(std::chrono::steady_clock::time_point& lastFlush) {
+    FileMark mark;
+    {
+        std::unique_lock lock(mutex_);
+        for (;;) {
+            if (writerDone_ || failed()) return false;
+            const bool news =
+                written_.bytes > durable_.bytes || written_.candidate > durable_.candidate;
+            const auto due = lastFlush + hooks_.checkpointInterval;
+            if (news && std::chrono::steady_clock::now() >= due) break;
+            if (news)
+                changed_.wait_until(lock, due);
+            else
+                changed_.wait(lock);
+        }
+        mark = written_;
+    }
+    lastFlush = std::chrono::steady_clock::now();
+    if (const int error = sink_.sync(); error != 0) {
+        fail({PipelineFailure::Kind::Sync, error, {}});
+        return false;
+    }
+    const Checkpoint checkpoint{mark.candidate, limit_, 1};
+    if (std::string reason = saveCheckpoint(hooks_, checkpointPath_, checkpoint); !reason.empty()) {
+        fail({PipelineFailure::Kind::Checkpoint, 0, std::move(reason)});
+        return false;
+    }
+    {
+        std::lock_guard lock(mutex_);
+        durable_ = mark;
+    }
+    if (hooks_.afterCheckpoint) hooks_.afterCheckpoint(checkpoint, mark.bytes);
+    return true;
+}
+
+}  // namespace tarn

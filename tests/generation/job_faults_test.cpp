@@ -1,0 +1,255 @@
+// Nothing lost, cut or reordered, whatever fails: a fresh job and a resume each meet one injected
+// fault (a results write that fills the disk at a byte offset, a flush or a checkpoint rewrite
+// that fails once or from then on, an exception on any of the job's three threads), must report
+// it, must leave every record they had on the disk and a file of whole records in order, and a
+// resume on a working disk must then finish the file of one uninterrupted job, byte for byte.
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <cerrno>
+#include <cstdio>
+#include <stdexcept>
+#include <thread>
+
+#include "core/file_messages.hpp"
+#include "generation/generation_job.hpp"
+#include "generation/results_oracle.hpp"
+#include "generation/resume_job.hpp"
+#include "support/temp_folder.hpp"
+
+namespace tarn {
+namespace {
+
+using namespace test;
+using namespace std::chrono_literals;
+
+constexpr std::int64_t kLimit = 100'000;  // about 70 KB of records, 17 buffers of 4 KiB
+
+struct Fault {
+    enum class Kind {
+        Write,              // the disk fills once the run has written `at` bytes
+        Sync,               // the at-th flush fails
+        Checkpoint,         // the at-th checkpoint rewrite fails
+        ThrowInWriter,      // the writer meets an exception at byte `at`
+        ThrowInProducer,    // the sieving thread meets one after batch `at`
+        ThrowInCheckpoint,  // the checkpointer meets one at its at-th rewrite
+    };
+    Kind kind;
+    std::uint64_t at;
+    bool persistent = false;  // Sync, Checkpoint: every later call fails too
+};
+
+std::string describe(const Fault& f) {
+    static const char* names[] = {"write",
+                                  "sync",
+                                  "checkpoint",
+                                  "throw in writer",
+                                  "throw in producer",
+                                  "throw in checkpoint"};
+    return std::string(names[static_cast<int>(f.kind)]) + " at " + std::to_string(f.at) +
+           (f.persistent ? " from then on" : "");
+}
+
+// Counts the calls of one run and fails the one the fault names.
+struct Injector {
+    Fault fault;
+    std::atomic<std::uint64_t> written{0}, syncs{0}, checkpoints{0};
+    std::atomic<bool> fired{false};
+
+    bool hits(Fault::Kind kind, std::uint64_t count) {
+        const bool hit =
+            fault.kind == kind && (count == fault.at || (fault.persistent && count > fault.at));
+        if (hit) fired = true;
+        return hit;
+    }
+};
+
+class FaultySink final : public ResultsSink {
+public:
+    FaultySink(std::unique_ptr<ResultsSink> file, Injector& injector)
+        : file_(std::move(file)), injector_(injector) {}
+    int write(const char* data, std::size_t size, std::size_t& written) override {
+        const Fault& f = injector_.fault;
+        const std::uint64_t before = injector_.written;
+        written = 0;
+        if ((f.kind == Fault::Kind::Write || f.kind == Fault::Kind::ThrowInWriter) &&
+            before + size > f.at) {
+            injector_.fired = true;
+            if (f.kind == Fault::Kind::ThrowInWriter) throw std::runtime_error("injected");
+            const std::size_t part = static_cast<std::size_t>(f.at - std::min(f.at, before));
+            const int error = file_->write(data, part, written);
+            injector_.written += written;
+            return error != 0 ? error : ENOSPC;
+        }
+        const int error = file_->write(data, size, written);
+        injector_.written += written;
+        return error;
+    }
+    int sync() override {
+        return injector_.hits(Fault::Kind::Sync, ++injector_.syncs) ? EIO : file_->sync();
+    }
+    int truncate(std::uint64_t size) override { return file_->truncate(size); }
+    int close() override { return file_->close(); }
+    std::uint64_t size() const override { return file_->size(); }
+
+private:
+    std::unique_ptr<ResultsSink> file_;
+    Injector& injector_;
+};
+
+JobHooks faultyHooks(Injector& injector) {
+    JobHooks hooks;
+    hooks.bufferBytes = 4096;
+    hooks.turnsPerBatch = 16;
+    hooks.checkpointInterval = 0ms;
+    hooks.openResults = [&injector](const std::string& path, bool append, int& error) {
+        auto file = openResultsFile(path, append, error);
+        return file ? std::make_unique<FaultySink>(std::move(file), injector) : nullptr;
+    };
+    hooks.writeCheckpoint = [&injector](const std::string& path, const Checkpoint& c) {
+        const std::uint64_t count = ++injector.checkpoints;
+        if (injector.hits(Fault::Kind::ThrowInCheckpoint, count))
+            throw std::runtime_error("injected");
+        if (injector.hits(Fault::Kind::Checkpoint, count)) return systemReason(EIO);
+        return writeCheckpoint(path, c);
+    };
+    // Slow enough that the checkpointer flushes many times whatever the machine's speed.
+    hooks.afterBatch = [&injector](std::int64_t batches) {
+        if (injector.hits(Fault::Kind::ThrowInProducer, static_cast<std::uint64_t>(batches) / 16))
+            throw std::runtime_error("injected");
+        std::this_thread::sleep_for(50us);
+    };
+    return hooks;
+}
+
+std::string expectedMessage(const Fault& f, const std::string& folder) {
+    switch (f.kind) {
+        case Fault::Kind::Write:
+            return "The file " + folder +
+                   "primes.txt could not be written: " + systemReason(ENOSPC) + ".";
+        case Fault::Kind::Sync:
+            return "The file " + folder + "primes.txt could not be written: " + systemReason(EIO) +
+                   ".";
+        case Fault::Kind::Checkpoint:
+            return "The file " + folder + "primes.ini could not be written: " + systemReason(EIO) +
+                   ".";
+        default:
+            return "The job stopped on an unexpected error: injected.";
+    }
+}
+
+// The checkpoint's candidate, or 0 when there is none to continue from.
+std::int64_t resumePoint(const std::string& folder) {
+    const std::string line = readFile(folder + "primes.ini");
+    long long candidate = 0, limit = 0;
+    int interrupted = 0;
+    if (std::sscanf(line.c_str(), "%lld %lld %d", &candidate, &limit, &interrupted) != 3 ||
+        interrupted != 1)
+        return 0;
+    return candidate;
+}
+
+// A fresh job, or (stopAfter > 0) a resume of a job stopped after that many turns, meets the
+// fault; then the file is finished on a working disk.
+void runWithFault(const Fault& fault, bool enumerated, std::int64_t stopAfter, int& fired) {
+    SCOPED_TRACE(describe(fault) + (enumerated ? ", enumerated" : ", plain") +
+                 (stopAfter > 0 ? ", resumed" : ", fresh"));
+    TempFolder folder;
+    const std::string full = oracleResults(kLimit, enumerated);
+    std::int64_t kept = 0;  // candidate up to which records were on the disk before the run
+    if (stopAfter > 0) {
+        StopSignal stop;
+        JobHooks hooks;
+        hooks.turnsPerBatch = 1;
+        hooks.afterBatch = [&](std::int64_t done) {
+            if (done >= stopAfter) stop.request();
+        };
+        const JobResult r = runJob({folder.path(), kLimit, enumerated}, stop, nullptr, hooks);
+        ASSERT_EQ(r.status, JobResult::Status::Stopped);
+        kept = r.candidate;
+    }
+
+    Injector injector{fault};
+    const JobHooks hooks = faultyHooks(injector);
+    std::string message;
+    if (stopAfter > 0) {
+        const ResumeResult r = runResume(folder.path(), StopSignal{}, nullptr, {}, hooks);
+        message = r.status == ResumeResult::Status::Failed ? r.message : "";
+    } else {
+        const JobResult r =
+            runJob({folder.path(), kLimit, enumerated}, StopSignal{}, nullptr, hooks);
+        message = r.status == JobResult::Status::Failed ? r.error : "";
+    }
+    if (injector.fired) {
+        ++fired;
+        EXPECT_EQ(message, expectedMessage(fault, folder.path()));
+        // Whole records in order, and nothing that was on the disk before the run is gone.
+        const std::string file = readFile(folder.path() + "primes.txt");
+        EXPECT_TRUE(full.starts_with(file)) << file.size() << " bytes";
+        EXPECT_TRUE(file.ends_with("\r\n") || file.empty());
+        const std::int64_t point = resumePoint(folder.path());
+        EXPECT_GE(point, kept);
+        EXPECT_TRUE(file.starts_with(oracleResults(point, enumerated))) << "checkpoint " << point;
+    }
+
+    // A working disk: resume what can be resumed, generate again what cannot.
+    for (int attempt = 0;
+         attempt < 2 && readFile(folder.path() + "primes.ini") != completeCheckpoint(kLimit);
+         ++attempt) {
+        if (resumePoint(folder.path()) > 0) {
+            const ResumeResult r = runResume(folder.path(), StopSignal{}, nullptr, {});
+            EXPECT_EQ(r.status, ResumeResult::Status::Completed) << r.message;
+        } else {
+            runJob({folder.path(), kLimit, enumerated}, StopSignal{}, nullptr);
+        }
+    }
+    EXPECT_TRUE(sameText(readFile(folder.path() + "primes.txt"), full));
+    EXPECT_EQ(readFile(folder.path() + "primes.ini"), completeCheckpoint(kLimit));
+}
+
+std::vector<Fault> faultTable() {
+    using K = Fault::Kind;
+    std::vector<Fault> faults;
+    // Inside the seed records, on the edges of a buffer, deep into the run.
+    for (const std::uint64_t at : {0, 1, 5, 12, 13, 4095, 4096, 4097, 20000, 33333, 50001})
+        faults.push_back({K::Write, at});
+    for (const std::uint64_t at : {1, 2, 3, 5}) {
+        for (const bool persistent : {false, true}) {
+            faults.push_back({K::Sync, at, persistent});
+            faults.push_back({K::Checkpoint, at, persistent});
+        }
+    }
+    for (const std::uint64_t at : {0, 9000, 30000}) faults.push_back({K::ThrowInWriter, at});
+    for (const std::uint64_t at : {1, 3}) {
+        faults.push_back({K::ThrowInProducer, at});
+        faults.push_back({K::ThrowInCheckpoint, at});
+    }
+    return faults;
+}
+
+TEST(JobFaults, AFreshJobKeepsItsRecordsAndAResumeFinishesTheFile) {
+    int fired = 0, total = 0;
+    for (const Fault& fault : faultTable()) {
+        for (const bool enumerated : {false, true}) {
+            ++total;
+            runWithFault(fault, enumerated, 0, fired);
+        }
+    }
+    // A flush or checkpoint that the run ended before is the only fault allowed not to happen.
+    EXPECT_GE(fired, total - 4);
+}
+
+TEST(JobFaults, AResumeKeepsEveryRecordOnTheDiskAndAnotherFinishesTheFile) {
+    int fired = 0, total = 0;
+    for (const Fault& fault : faultTable()) {
+        for (const bool enumerated : {false, true}) {
+            ++total;
+            runWithFault(fault, enumerated, 300, fired);
+        }
+    }
+    EXPECT_GE(fired, total - 4);
+}
+
+}  // namespace
+}  // namespace tarn
