@@ -17,6 +17,7 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
         std::string limit;
         bool enumerate = false;
         bool noSync = false;
+        int threads = 0;
         JobHooks hooks;
     };
     auto options = std::make_shared<Options>();
@@ -29,6 +30,7 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
                        "Write records as serial number;prime (5;11)");
     // Measurements only: leaves out the periodic flush to the disk and its checkpoints.
     generate->add_flag("--no-sync", options->noSync)->group("");
+    addThreadsOption(*generate, options->threads);
     addCheckpointIntervalOption(*generate, options->hooks);
     generate->callback([&ctx, options] {
         const EntryResult entry = ReadNumberEntry(options->limit);
@@ -46,6 +48,7 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
         spec.folder = ctx.folder;
         spec.limit = entry.number->whole();
         spec.enumerated = options->enumerate;
+        spec.threads = options->threads;
         JobHooks hooks = options->hooks;
         hooks.durable = !options->noSync;
         JobProgress progress;

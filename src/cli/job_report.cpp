@@ -5,12 +5,26 @@
 #include <CLI/CLI.hpp>
 #include <cstdio>
 #include <iostream>
+#include <string>
 
 #include "cli/cli_context.hpp"
 #include "core/command_texts.hpp"
 #include "generation/job_texts.hpp"
 
 namespace tarn::cli {
+
+namespace {
+
+// h:mm:ss
+std::string clockText(double seconds) {
+    const auto whole = static_cast<long long>(std::max(0.0, seconds) + 0.5);
+    char text[32];
+    std::snprintf(text, sizeof text, "%lld:%02lld:%02lld", whole / 3600, whole / 60 % 60,
+                  whole % 60);
+    return text;
+}
+
+}  // namespace
 
 ProgressLine::ProgressLine(const JobProgress& progress, std::int64_t from, std::int64_t limit)
     : progress_(progress), from_(from), limit_(limit) {
@@ -40,9 +54,11 @@ void ProgressLine::run() {
         const double done = std::max(0.0, static_cast<double>(at - from_));
         const double share = span > 0 ? std::min(1.0, done / span) : 1.0;
         const double rate = seconds > 0 ? done / seconds : 0;
-        const double left = rate > 0 ? (span - done) / rate : 0;
-        std::fprintf(stderr, "\r\033[K%5.1f%%  %lld primes  %.3g numbers/s  %.0f s left",
-                     100.0 * share, static_cast<long long>(primes), rate, left);
+        const std::string elapsed = clockText(seconds);
+        // The rate so far, over what is left; nothing to say until the job has moved.
+        const std::string left = rate > 0 ? clockText((span - done) / rate) : "-:--:--";
+        std::fprintf(stderr, "\r\033[K%5.1f%%  %lld primes  %s elapsed  %s left", 100.0 * share,
+                     static_cast<long long>(primes), elapsed.c_str(), left.c_str());
         std::fflush(stderr);
     }
 }
@@ -61,6 +77,11 @@ int reportJob(const JobResult& result) {
     }
     std::cerr << result.error << '\n';
     return kIoFailure;
+}
+
+void addThreadsOption(CLI::App& command, int& threads) {
+    command.add_option("--threads", threads, "Sieving threads (default: one per core)")
+        ->check(CLI::Range(1, 1024));
 }
 
 void addCheckpointIntervalOption(CLI::App& command, JobHooks& hooks) {

@@ -17,8 +17,10 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
     auto* command =
         app.add_subcommand("resume", "Continue the stopped generation job recorded in primes.ini");
     auto hooks = std::make_shared<JobHooks>();
+    auto threads = std::make_shared<int>(0);
+    addThreadsOption(*command, *threads);
     addCheckpointIntervalOption(*command, *hooks);
-    command->callback([&ctx, hooks] {
+    command->callback([&ctx, hooks, threads] {
         JobProgress progress;
         std::optional<ProgressLine> line;
         ResumeEvents events;
@@ -27,7 +29,8 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
             std::cerr << kDoingResumeInfoLine << '\n';
             line.emplace(progress, start.resumePoint, start.limit);
         };
-        const ResumeResult result = runResume(ctx.folder, ctx.stop, &progress, events, *hooks);
+        const ResumeResult result =
+            runResume(ctx.folder, ctx.stop, &progress, events, *hooks, *threads);
         line.reset();
         switch (result.status) {
             case ResumeResult::Status::NothingToResume:

@@ -9,12 +9,15 @@
 #include "generation/generation_job.hpp"
 
 #include <algorithm>
+#include <cmath>
 #include <new>
 #include <optional>
+#include <thread>
 #include <vector>
 
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
+#include "generation/chunk_producer.hpp"
 #include "generation/file_names.hpp"
 #include "generation/record_formatter.hpp"
 #include "generation/wheel_sieve.hpp"
@@ -24,111 +27,23 @@ namespace tarn {
 namespace {
 
 constexpr std::int64_t kSegmentTurns = 32 * 1024;  // 32 KiB of sieve: the first-level cache
-constexpr std::size_t kBufferBytes = 4u << 20;     // one write(2) each
-constexpr std::size_t kSmallestBuffer = 4096;      // room for a turn of the longest records
+constexpr std::int64_t kSegmentsPerChunk = 8;      // a few MiB of records per write
+// Memory for the sieving threads' own state and their buffers, whatever the core count.
+constexpr std::uint64_t kThreadBudget = 48u << 20;
+constexpr std::uint64_t kChunkRecordBytes = 40;  // per turn at most, in practice
 
-// Sieves wheel turns and formats their primes into the pipeline's buffers, handing a buffer over
-// only at a turn boundary, with the candidate and record count its end stands for.
-class RecordProducer {
-public:
-    RecordProducer(WritePipeline& pipeline, WheelSieve& sieve, RecordFormatter& formatter,
-                   std::int64_t limit, std::int64_t count, const JobHooks& hooks,
-                   JobProgress* progress)
-        : pipeline_(pipeline),
-          sieve_(sieve),
-          formatter_(formatter),
-          limit_(limit),
-          count_(count),
-          hooks_(hooks),
-          progress_(progress) {
-        open(pipeline_.take());
-    }
-
-    void putSeeds() {
-        for (const std::uint64_t seed : {2, 3, 5, 7}) out_ = formatter_.put(out_, seed);
-        count_ = 4;
-        handOver(7);
-        open(pipeline_.take());
-    }
-
-    // Turns [first, end); returns the turn it stopped before.
-    std::int64_t run(std::int64_t first, std::int64_t end, const StopSignal& stop, bool& stopped) {
-        const std::int64_t segmentTurns =
-            hooks_.turnsPerBatch > 0 ? hooks_.turnsPerBatch : kSegmentTurns;
-        std::vector<std::uint8_t> segment(static_cast<std::size_t>(
-            std::min(segmentTurns, std::max<std::int64_t>(end - first, 1))));
-        std::int64_t turn = first;
-        std::int64_t length = 1;  // the first batch is a single turn
-        while (turn < end) {
-            length = std::min(length, end - turn);
-            if (progress_) progress_->candidate.store(turnStart(turn), std::memory_order_relaxed);
-            sieve_.sieveNext(segment.data(), static_cast<std::size_t>(length));
-            if (turn + length == end) {
-                // Candidates above the limit in the last turn are neither tested nor written.
-                const std::int64_t last = turnStart(end - 1);
-                for (int b = 0; b < 8; ++b)
-                    if (last + kTurnOffsets[b] > limit_)
-                        segment[length - 1] |= std::uint8_t(1u << b);
-            }
-            format(segment.data(), turn, length);
-            turn += length;
-            length = segmentTurns;
-            if (hooks_.afterBatch) hooks_.afterBatch(turn - first);
-            if (pipeline_.failed()) break;
-            if (turn < end && stop.requested()) {
-                stopped = true;
-                break;
-            }
-        }
-        handOver(turnStart(turn) - 4);
-        return turn;
-    }
-
-    std::int64_t count() const { return count_; }
-
-private:
-    void format(const std::uint8_t* segment, std::int64_t turn, std::int64_t length) {
-        for (std::int64_t j = 0; j < length; ++j) {
-            if (out_ > full_) {
-                handOver(turnStart(turn + j) - 4);
-                open(pipeline_.take());
-            }
-            unsigned primes = static_cast<std::uint8_t>(~segment[j]);
-            const auto start = static_cast<std::uint64_t>(turnStart(turn + j));
-            while (primes != 0) {
-                out_ = formatter_.put(out_, start + kTurnOffsets[__builtin_ctz(primes)]);
-                primes &= primes - 1;
-                ++count_;
-            }
-        }
-    }
-
-    void open(RecordBuffer* buffer) {
-        buffer_ = buffer;
-        out_ = buffer->bytes.data();
-        // Room for one whole turn of records before the buffer is handed over.
-        full_ = out_ + buffer->bytes.size() - 8 * RecordFormatter::kMaxRecord;
-    }
-
-    void handOver(std::int64_t lastCandidate) {
-        buffer_->size = static_cast<std::size_t>(out_ - buffer_->bytes.data());
-        buffer_->lastCandidate = lastCandidate;
-        buffer_->primeCount = count_;
-        pipeline_.hand(buffer_);
-        buffer_ = nullptr;
-    }
-
-    WritePipeline& pipeline_;
-    WheelSieve& sieve_;
-    RecordFormatter& formatter_;
-    const std::int64_t limit_;
-    std::int64_t count_;
-    const JobHooks& hooks_;
-    JobProgress* progress_;
-    RecordBuffer* buffer_ = nullptr;
-    char* out_ = nullptr;
-    const char* full_ = nullptr;
-};
+// One sieving thread per core, as many as the memory budget holds: each keeps the crossing-off
+// state of every sieving prime (16 bytes each, about 30 MB at the top of the range) and fills
+// chunk buffers; two buffers more keep the writer busy.
+int sievingThreads(int requested, std::int64_t limit, std::int64_t chunkTurns) {
+    int threads = requested > 0 ? requested : static_cast<int>(std::thread::hardware_concurrency());
+    const double root = std::sqrt(static_cast<double>(std::max<std::int64_t>(limit, 100)));
+    const auto sieveBytes = static_cast<std::uint64_t>(16 * 1.3 * root / std::log(root));
+    const std::uint64_t chunkBytes =
+        static_cast<std::uint64_t>(chunkTurns) * (kChunkRecordBytes + 1);
+    const auto fit = static_cast<int>(kThreadBudget / (sieveBytes + 2 * chunkBytes));
+    return std::clamp(threads, 1, std::max(fit, 1));
+}
 
 // The whole "Info" message for the first failure.
 std::string failureMessage(const PipelineFailure& failure, const std::string& resultsPath,
@@ -213,32 +128,45 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
     const FileMark start = spec.append
                                ? FileMark{sink->size(), firstTurnStart - 4, spec.primeCountBefore}
                                : FileMark{0, 0, 0};
-    const std::size_t bufferBytes =
-        hooks.bufferBytes > 0 ? std::max(hooks.bufferBytes, kSmallestBuffer) : kBufferBytes;
     if (progress) {
         progress->candidate.store(firstTurnStart, std::memory_order_relaxed);
         progress->primeCount.store(start.primeCount, std::memory_order_relaxed);
     }
 
-    std::int64_t count = start.primeCount;
-    bool stopped = false;
-    std::int64_t reached = first;
+    ChunkPlan plan;
+    plan.firstTurn = first;
+    plan.endTurn = end;
+    plan.limit = spec.limit;
+    plan.recordsBefore = spec.append ? spec.primeCountBefore : 4;
+    plan.firstSequence = spec.append ? 0 : 1;
+    plan.enumerated = spec.enumerated;
+    plan.segmentTurns = hooks.turnsPerBatch > 0 ? hooks.turnsPerBatch : kSegmentTurns;
+    plan.chunkTurns =
+        hooks.turnsPerChunk > 0 ? hooks.turnsPerChunk : plan.segmentTurns * kSegmentsPerChunk;
+    const int threads = sievingThreads(spec.threads, spec.limit, plan.chunkTurns);
+
     FileMark written, durable;
     {
-        WritePipeline pipeline(*sink, hooks, checkpointPath, spec.limit, bufferBytes, start,
+        WritePipeline pipeline(*sink, hooks, checkpointPath, spec.limit, threads + 2, start,
                                progress);
         try {
             pipeline.start();
-            RecordFormatter formatter(
-                spec.append ? static_cast<std::uint64_t>(firstTurnStart - 4) : 0,
-                static_cast<std::uint64_t>(count), spec.enumerated);
-            RecordProducer producer(pipeline, *sieve, formatter, spec.limit, count, hooks,
-                                    progress);
-            if (!spec.append) producer.putSeeds();
-            reached = producer.run(first, end, stop, stopped);
-            count = producer.count();
+            if (!spec.append) {
+                RecordBuffer* seeds = pipeline.take();
+                char* out = seeds->reserve(4 * RecordFormatter::kMaxRecord);
+                RecordFormatter formatter(0, 0, spec.enumerated);
+                for (const std::uint64_t seed : {2, 3, 5, 7}) out = formatter.put(out, seed);
+                seeds->size = static_cast<std::size_t>(out - seeds->data.get());
+                seeds->sequence = 0;
+                seeds->lastCandidate = 7;
+                seeds->primeCount = 4;
+                pipeline.hand(seeds);
+            }
+            ChunkProducer producer(plan, pipeline, stop, hooks, progress);
+            producer.start(threads);
+            producer.join();
         } catch (...) {
-            // The buffer being filled is dropped; what was handed over is written or not.
+            // What was handed over is written or not; the rest is dropped.
             pipeline.fail({PipelineFailure::Kind::Internal, 0, describeCurrentException()});
         }
         pipeline.finish();
@@ -250,6 +178,8 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
                            pipeline.failure(), result);
         }
     }
+    // The file ends after the last whole turn written; short of the end, the job was stopped.
+    const bool stopped = written.candidate + 4 < turnStart(end);
 
     if (const int error = hooks.durable ? sink->sync() : 0; error != 0) {
         // The system could not confirm the records: claim none past the last flush.
@@ -259,8 +189,8 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
     // Past a good flush every record is on the disk, so the checkpoint may say so even when
     // closing reports an error.
     const int closing = sink->close();
-    result.primeCount = count;
-    result.candidate = stopped ? turnStart(reached) - 4 : turnStart(end);
+    result.primeCount = written.primeCount;
+    result.candidate = stopped ? written.candidate : turnStart(end);
     result.status = stopped ? JobResult::Status::Stopped : JobResult::Status::Completed;
     const Checkpoint checkpoint{result.candidate, spec.limit, stopped ? 1 : 0};
     if (std::string reason = saveCheckpoint(hooks, checkpointPath, checkpoint); !reason.empty()) {
@@ -270,7 +200,7 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
         result.status = JobResult::Status::Failed;
         result.error = fileWriteFailure(result.resultsPath, systemReason(closing));
     }
-    if (progress) progress->primeCount.store(count, std::memory_order_relaxed);
+    if (progress) progress->primeCount.store(written.primeCount, std::memory_order_relaxed);
     return result;
 }
 

@@ -32,6 +32,7 @@ struct JobSpec {
     bool append = false;
     std::int64_t firstTurn = 11;
     std::int64_t primeCountBefore = 0;
+    int threads = 0;  // sieving threads; 0: one per core
 };
 
 struct JobResult {
@@ -53,8 +54,9 @@ struct JobHooks {
     // Opens the results file in place of openResultsFile (tests fail it at a chosen byte).
     std::function<std::unique_ptr<ResultsSink>(const std::string& path, bool append, int& error)>
         openResults;
-    // Runs on the sieving thread after each batch of wheel turns, before the stop check, with the
-    // count of turns finished since the job's first turn. The first batch is one turn.
+    // Runs on a sieving thread after each batch of wheel turns, before the stop check, with the
+    // count of turns from the job's first turn to the batch's end. The first batch is one turn.
+    // Several threads may call it at once.
     std::function<void(std::int64_t turnsDone)> afterBatch;
     // Runs after each checkpoint rewritten during the job, with the results bytes it covers
     // (all of them flushed to the disk before the checkpoint was written).
@@ -64,7 +66,7 @@ struct JobHooks {
         writeCheckpoint;
     std::chrono::milliseconds checkpointInterval{2000};
     std::int64_t turnsPerBatch = 0;  // 0: sized for the first-level cache
-    std::size_t bufferBytes = 0;     // 0: 4 MiB per write
+    std::int64_t turnsPerChunk = 0;  // 0: eight batches; each chunk is one write
     // false: no flush to the disk and no checkpoint during the job (measures their cost).
     bool durable = true;
 };

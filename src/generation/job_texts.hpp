@@ -17,5 +17,4 @@ inline constexpr std::string_view kMinimumMessage = "Minimum value is 100";
 std::optional<std::string> checkGenerationMinimum(std::int64_t whole);
 std::optional<std::string> checkGenerationMinimum(const Number& number);
 
-
 }  // namespace tarn

@@ -39,14 +39,14 @@ ResumeResult stoppedWhileGathering(const std::string& resultsPath, std::int64_t 
 }
 
 ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                    const ResumeEvents& events, const JobHooks& hooks);
+                    const ResumeEvents& events, const JobHooks& hooks, int threads);
 
 }  // namespace
 
 ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                       const ResumeEvents& events, const JobHooks& hooks) {
+                       const ResumeEvents& events, const JobHooks& hooks, int threads) {
     try {
-        return resume(folder, stop, progress, events, hooks);
+        return resume(folder, stop, progress, events, hooks, threads);
     } catch (...) {
         // Reading and checking change no file, and the job guards its own writes.
         ResumeResult result;
@@ -62,7 +62,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
 namespace {
 
 ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                    const ResumeEvents& events, const JobHooks& hooks) {
+                    const ResumeEvents& events, const JobHooks& hooks, int threads) {
     const std::string checkpointPath = folder + kCheckpointFileName;
     const std::string resultsPath = folder + kResultsFileName;
 
@@ -116,6 +116,7 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     spec.append = true;
     spec.firstTurn = resumePoint + 4;
     spec.primeCountBefore = scan.records;
+    spec.threads = threads;
 
     ResumeResult result;
     result.job = runJob(spec, stop, progress, hooks);

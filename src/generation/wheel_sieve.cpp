@@ -89,6 +89,25 @@ WheelSieve::WheelSieve(std::int64_t firstTurn, std::int64_t limit) : turn_(first
     }
 }
 
+void WheelSieve::skipTo(std::int64_t turn) {
+    if (turn <= turn_) return;
+    const auto gap = static_cast<std::uint64_t>(turn - turn_);
+    for (Small& s : small_) {
+        for (std::uint64_t& next : s.next)
+            next = next >= gap ? next - gap : (s.p - (gap - next) % s.p) % s.p;
+    }
+    const auto start = static_cast<std::uint64_t>(turnStart(turn));
+    for (Large& l : large_) {
+        if (l.multiple >= start) continue;
+        std::uint32_t wheel = 0;
+        const std::uint64_t q =
+            nextWheelNumber(std::max<std::uint64_t>(l.p, (start + l.p - 1) / l.p), wheel);
+        l.multiple = l.p * q;
+        l.wheel = wheel;
+    }
+    turn_ = turn;
+}
+
 void WheelSieve::sieveNext(std::uint8_t* bytes, std::size_t turns) {
     std::memset(bytes, 0, turns);
     const std::uint64_t length = turns;

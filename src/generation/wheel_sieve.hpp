@@ -28,6 +28,12 @@ public:
     // the number is composite.
     void sieveNext(std::uint8_t* bytes, std::size_t turns);
 
+    // Moves on to `turn` (not before the next one) without sieving the turns in between, so that
+    // one sieve can serve segments far apart: small primes by a remainder, large ones that have
+    // fallen behind by a division each.
+    void skipTo(std::int64_t turn);
+    std::int64_t nextTurn() const { return turn_; }
+
 private:
     struct Small {
         std::uint32_t p;

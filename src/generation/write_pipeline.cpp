@@ -10,20 +10,27 @@ std::string saveCheckpoint(const JobHooks& hooks, const std::string& path,
                                  : writeCheckpoint(path, checkpoint);
 }
 
+char* RecordBuffer::reserve(std::size_t bytes) {
+    if (bytes > capacity) {
+        data.reset();  // the old storage goes before the new one comes
+        data.reset(new char[bytes]);
+        capacity = bytes;
+    }
+    return data.get();
+}
+
 WritePipeline::WritePipeline(ResultsSink& sink, const JobHooks& hooks, std::string checkpointPath,
-                             std::int64_t limit, std::size_t bufferBytes, FileMark start,
+                             std::int64_t limit, int bufferCount, FileMark start,
                              JobProgress* progress)
     : sink_(sink),
       hooks_(hooks),
       checkpointPath_(std::move(checkpointPath)),
       limit_(limit),
       progress_(progress),
+      buffers_(static_cast<std::size_t>(bufferCount)),
       written_(start),
       durable_(start) {
-    for (RecordBuffer& b : buffers_) {
-        b.bytes.resize(bufferBytes);
-        free_.push_back(&b);
-    }
+    for (RecordBuffer& b : buffers_) free_.push_back(&b);
 }
 
 WritePipeline::~WritePipeline() { finish(); }
@@ -42,16 +49,17 @@ void WritePipeline::start() {
 
 RecordBuffer* WritePipeline::take() {
     std::unique_lock lock(mutex_);
-    changed_.wait(lock, [this] { return !free_.empty(); });
-    RecordBuffer* b = free_.front();
-    free_.pop_front();
+    changed_.wait(lock, [this] { return !free_.empty() || failed(); });
+    if (failed()) return nullptr;
+    RecordBuffer* b = free_.back();
+    free_.pop_back();
     return b;
 }
 
 void WritePipeline::hand(RecordBuffer* buffer) {
     {
         std::lock_guard lock(mutex_);
-        full_.push_back(buffer);
+        ready_.emplace(buffer->sequence, buffer);
     }
     changed_.notify_all();
 }
@@ -84,21 +92,26 @@ void WritePipeline::release(RecordBuffer* buffer) {
 }
 
 void WritePipeline::writeLoop() {
+    bool ended = false;  // a buffer that ends the job was written: drop the rest
     for (;;) {
         RecordBuffer* b = nullptr;
         {
             std::unique_lock lock(mutex_);
-            changed_.wait(lock, [this] { return !full_.empty() || producerDone_; });
-            if (full_.empty()) break;
-            b = full_.front();
-            full_.pop_front();
+            changed_.wait(lock, [this] { return ready_.contains(nextSequence_) || producerDone_; });
+            // Once the producers are done, a missing buffer is a turn never sieved.
+            const auto next = ready_.find(nextSequence_);
+            if (next == ready_.end()) break;
+            b = next->second;
+            ready_.erase(next);
+            ++nextSequence_;
         }
-        if (!failed()) {
+        if (!failed() && !ended) {
             try {
                 writeOne(*b);
             } catch (...) {
                 fail({PipelineFailure::Kind::Internal, 0, describeCurrentException()});
             }
+            ended = b->endsJob;
         }
         release(b);
     }
@@ -113,7 +126,7 @@ void WritePipeline::writeOne(RecordBuffer& b) {
     if (b.size != 0) {
         const std::uint64_t offset = sink_.size();
         std::size_t reached = 0;
-        if (const int error = sink_.write(b.bytes.data(), b.size, reached); error != 0) {
+        if (const int error = sink_.write(b.data.get(), b.size, reached); error != 0) {
             fail({PipelineFailure::Kind::Write, error, {}});
             return;
         }

@@ -1,19 +1,22 @@
-// The back half of the generation job: a writer thread that writes each full buffer of records
-// with one write(2) and starts its writeback, and a checkpointer thread that every interval
-// flushes the results file with fdatasync and only then rewrites the checkpoint (Interrupted 1,
-// the last candidate of the last turn whose records are all on the disk). The producer sieves
-// and formats into the free buffers meanwhile, so the cores and the disk work at once.
+// The back half of the generation job: a writer thread that writes the producers' buffers to the
+// results file strictly in their order, one write(2) each, starting their writeback at once; and
+// a checkpointer thread that every interval flushes the results file with fdatasync and only
+// then rewrites the checkpoint (Interrupted 1, the last candidate of the last turn whose records
+// are all on the disk). The producers fill the free buffers meanwhile, so every core and the
+// disk work at once, and the fixed count of buffers bounds the memory.
 //
 // Byte marks are offsets in the results file as the sink counts them, so a job that continues a
 // file knows exactly what lies on the disk before and after its own records. Nothing here
-// throws to the producer: a failure on either thread, an exception included, is kept and raises
+// throws to the producers: a failure on either thread, an exception included, is kept and raises
 // failed(), after which the writer drops every further buffer.
 #pragma once
 
 #include <atomic>
+#include <chrono>
 #include <condition_variable>
 #include <cstdint>
-#include <deque>
+#include <map>
+#include <memory>
 #include <mutex>
 #include <string>
 #include <thread>
@@ -23,12 +26,18 @@
 
 namespace tarn {
 
-// Records formatted by the producer, ending at a turn boundary.
+// Records of consecutive whole turns, ready for the file.
 struct RecordBuffer {
-    std::vector<char> bytes;
+    std::unique_ptr<char[]> data;
+    std::size_t capacity = 0;
     std::size_t size = 0;
-    std::int64_t lastCandidate = 0;  // last candidate of the last whole turn in the buffer
+    std::uint64_t sequence = 0;      // its place in the file among the job's buffers
+    std::int64_t lastCandidate = 0;  // last candidate of the last turn in the buffer
     std::int64_t primeCount = 0;     // records in the file once the buffer is written
+    bool endsJob = false;            // the producers stopped here: nothing after it is written
+
+    // Room for `bytes`; keeps the storage when it is large enough and never clears it.
+    char* reserve(std::size_t bytes);
 };
 
 // How far the records reach: in the file, or on the disk.
@@ -52,21 +61,22 @@ std::string saveCheckpoint(const JobHooks& hooks, const std::string& path,
 
 class WritePipeline {
 public:
-    static constexpr int kBufferCount = 4;
-
     WritePipeline(ResultsSink& sink, const JobHooks& hooks, std::string checkpointPath,
-                  std::int64_t limit, std::size_t bufferBytes, FileMark start,
-                  JobProgress* progress);
-    ~WritePipeline();  // finishes first when the producer left by an exception
+                  std::int64_t limit, int bufferCount, FileMark start, JobProgress* progress);
+    ~WritePipeline();  // finishes first when a producer left by an exception
     WritePipeline(const WritePipeline&) = delete;
     WritePipeline& operator=(const WritePipeline&) = delete;
 
     void start();
-    RecordBuffer* take();  // waits for a free buffer
+    RecordBuffer* take();  // waits for a free buffer; nothing once the pipeline has failed
+    // Queues a buffer for writing in the order of its sequence number.
     void hand(RecordBuffer* buffer);
-    // No more buffers; waits until every one is written and both threads have left.
+    // Gives back a buffer that will not be handed over.
+    void release(RecordBuffer* buffer);
+    // No more buffers; writes what continues the file without a gap, then waits for both
+    // threads to leave.
     void finish();
-    // The producer failed: record why, so the failure path runs.
+    // A producer failed: record why, so the failure path runs.
     void fail(PipelineFailure failure);
 
     bool failed() const { return failed_.load(std::memory_order_acquire); }
@@ -80,7 +90,6 @@ private:
     void writeOne(RecordBuffer& buffer);
     void checkpointLoop();
     bool checkpointOnce(std::chrono::steady_clock::time_point& lastFlush);
-    void release(RecordBuffer* buffer);
 
     ResultsSink& sink_;
     const JobHooks& hooks_;
@@ -90,9 +99,10 @@ private:
 
     std::mutex mutex_;
     std::condition_variable changed_;
-    RecordBuffer buffers_[kBufferCount];
-    std::deque<RecordBuffer*> free_;
-    std::deque<RecordBuffer*> full_;
+    std::vector<RecordBuffer> buffers_;
+    std::vector<RecordBuffer*> free_;
+    std::map<std::uint64_t, RecordBuffer*> ready_;  // by sequence
+    std::uint64_t nextSequence_ = 0;
     bool producerDone_ = false;
     bool writerDone_ = false;
     std::atomic<bool> failed_{false};

@@ -112,7 +112,7 @@ TEST(GenerationJob, CheckpointsDuringTheJobAgreeWithTheFile) {
     JobHooks hooks;
     hooks.checkpointInterval = std::chrono::milliseconds(0);
     hooks.turnsPerBatch = 64;
-    hooks.bufferBytes = 4096;
+    hooks.turnsPerChunk = 64;
     // Slow the sieve down so that the checkpointer gets many turns whatever the machine's speed.
     hooks.afterBatch = [](std::int64_t) { std::this_thread::sleep_for(300us); };
     std::atomic<int> seen = 0;

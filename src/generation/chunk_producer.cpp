@@ -1,0 +1,182 @@
+#include "generation/chunk_producer.hpp"
+
+#include <algorithm>
+#include <bit>
+#include <cstring>
+#include <optional>
+#include <utility>
+
+#include "core/exception_text.hpp"
+#include "generation/record_formatter.hpp"
+
+namespace tarn {
+namespace {
+
+int decimalDigits(std::uint64_t n) {
+    int digits = 1;
+    while (n >= 10) {
+        n /= 10;
+        ++digits;
+    }
+    return digits;
+}
+
+}  // namespace
+
+ChunkProducer::ChunkProducer(const ChunkPlan& plan, WritePipeline& pipeline, const StopSignal& stop,
+                             const JobHooks& hooks, JobProgress* progress)
+    : plan_(plan), pipeline_(pipeline), stop_(stop), hooks_(hooks), progress_(progress) {}
+
+ChunkProducer::~ChunkProducer() {
+    close(false);
+    join();
+}
+
+void ChunkProducer::start(int threads) {
+    for (int i = 0; i < std::max(threads, 1); ++i) threads_.emplace_back([this] { work(); });
+}
+
+void ChunkProducer::join() {
+    for (std::thread& t : threads_)
+        if (t.joinable()) t.join();
+}
+
+void ChunkProducer::close(bool failed) {
+    {
+        std::lock_guard lock(mutex_);
+        closed_ = true;
+        failed_ = failed_ || failed;
+    }
+    published_.notify_all();
+}
+
+void ChunkProducer::work() {
+    RecordBuffer* buffer = nullptr;
+    try {
+        std::optional<WheelSieve> sieve;
+        std::vector<std::uint8_t> sieved(static_cast<std::size_t>(plan_.chunkTurns));
+        for (;;) {
+            // A buffer first, then a chunk: a claimed chunk never waits for memory.
+            buffer = pipeline_.take();
+            if (!buffer) return;
+            const Claim chunk = claim();
+            if (chunk.index < 0) break;
+            if (!sieve)
+                sieve.emplace(chunk.firstTurn, plan_.limit);
+            else
+                sieve->skipTo(chunk.firstTurn);
+            const std::int64_t reached = sieveChunk(*sieve, chunk, sieved);
+            const std::int64_t count = countPrimes(sieved, reached - chunk.firstTurn);
+            const std::int64_t before = recordsBefore(chunk.index);
+            if (before < 0) break;
+            publish(chunk.index, before + count);
+            format(chunk, reached, sieved, before, count, *buffer);
+            buffer->sequence = plan_.firstSequence + static_cast<std::uint64_t>(chunk.index);
+            buffer->endsJob = reached < chunk.endTurn;
+            if (buffer->endsJob) close(false);
+            pipeline_.hand(std::exchange(buffer, nullptr));
+        }
+    } catch (...) {
+        pipeline_.fail({PipelineFailure::Kind::Internal, 0, describeCurrentException()});
+        close(true);
+    }
+    if (buffer) pipeline_.release(buffer);
+}
+
+ChunkProducer::Claim ChunkProducer::claim() {
+    std::lock_guard lock(mutex_);
+    const std::int64_t first = plan_.firstTurn + nextChunk_ * plan_.chunkTurns;
+    // A stop between two chunks ends the job after the last whole one, but the job's first
+    // turn always runs.
+    if (closed_ || first >= plan_.endTurn || pipeline_.failed() ||
+        (nextChunk_ > 0 && stop_.requested())) {
+        closed_ = true;
+        return {};
+    }
+    if (progress_) progress_->candidate.store(turnStart(first), std::memory_order_relaxed);
+    return {nextChunk_++, first, std::min(first + plan_.chunkTurns, plan_.endTurn)};
+}
+
+std::int64_t ChunkProducer::sieveChunk(WheelSieve& sieve, const Claim& chunk,
+                                       std::vector<std::uint8_t>& sieved) {
+    std::int64_t turn = chunk.firstTurn;
+    std::int64_t length = chunk.index == 0 ? 1 : plan_.segmentTurns;
+    while (turn < chunk.endTurn) {
+        length = std::min(length, chunk.endTurn - turn);
+        std::uint8_t* segment = sieved.data() + (turn - chunk.firstTurn);
+        sieve.sieveNext(segment, static_cast<std::size_t>(length));
+        if (turn + length == plan_.endTurn) {
+            // Candidates above the limit in the last turn are neither tested nor written.
+            const std::int64_t last = turnStart(plan_.endTurn - 1);
+            for (int b = 0; b < 8; ++b)
+                if (last + kTurnOffsets[b] > plan_.limit)
+                    segment[length - 1] |= std::uint8_t(1u << b);
+        }
+        turn += length;
+        length = plan_.segmentTurns;
+        if (hooks_.afterBatch) hooks_.afterBatch(turn - plan_.firstTurn);
+        if (pipeline_.failed()) break;
+        if (turn < chunk.endTurn && stop_.requested()) break;
+    }
+    return turn;
+}
+
+std::int64_t ChunkProducer::countPrimes(const std::vector<std::uint8_t>& sieved,
+                                        std::int64_t turns) const {
+    std::int64_t count = 0;
+    std::size_t i = 0;
+    const auto n = static_cast<std::size_t>(turns);
+    for (; i + 8 <= n; i += 8) {
+        std::uint64_t word;
+        std::memcpy(&word, sieved.data() + i, 8);
+        count += std::popcount(~word);
+    }
+    for (; i < n; ++i) count += std::popcount(static_cast<std::uint8_t>(~sieved[i]));
+    return count;
+}
+
+std::int64_t ChunkProducer::recordsBefore(std::int64_t index) {
+    if (index == 0) return plan_.recordsBefore;
+    std::unique_lock lock(mutex_);
+    published_.wait(lock, [&] { return failed_ || recordsAfter_.contains(index - 1); });
+    if (failed_) return -1;
+    const auto it = recordsAfter_.find(index - 1);
+    const std::int64_t before = it->second;
+    recordsAfter_.erase(it);
+    return before;
+}
+
+void ChunkProducer::publish(std::int64_t index, std::int64_t recordsAfter) {
+    {
+        std::lock_guard lock(mutex_);
+        recordsAfter_[index] = recordsAfter;
+    }
+    published_.notify_all();
+}
+
+void ChunkProducer::format(const Claim& chunk, std::int64_t reached,
+                           const std::vector<std::uint8_t>& sieved, std::int64_t before,
+                           std::int64_t count, RecordBuffer& buffer) const {
+    const auto lastCandidate = static_cast<std::uint64_t>(turnStart(reached) - 4);
+    const std::size_t longest =
+        static_cast<std::size_t>(decimalDigits(lastCandidate)) + 2 +
+        (plan_.enumerated ? static_cast<std::size_t>(decimalDigits(before + count)) + 1 : 0);
+    char* const data =
+        buffer.reserve(static_cast<std::size_t>(count) * longest + RecordFormatter::kMaxRecord);
+    char* out = data;
+    RecordFormatter formatter(static_cast<std::uint64_t>(turnStart(chunk.firstTurn)),
+                              static_cast<std::uint64_t>(before), plan_.enumerated);
+    for (std::int64_t t = chunk.firstTurn; t < reached; ++t) {
+        unsigned primes = static_cast<std::uint8_t>(~sieved[t - chunk.firstTurn]);
+        const auto start = static_cast<std::uint64_t>(turnStart(t));
+        while (primes != 0) {
+            out = formatter.put(out, start + kTurnOffsets[std::countr_zero(primes)]);
+            primes &= primes - 1;
+        }
+    }
+    buffer.size = static_cast<std::size_t>(out - data);
+    buffer.lastCandidate = static_cast<std::int64_t>(lastCandidate);
+    buffer.primeCount = before + count;
+}
+
+}  // namespace tarn
