@@ -22,7 +22,8 @@ constexpr std::size_t kStagingSize = 64 * 1024;
 
 
 // One output file. Runs of whole records go to the system as they stand; the small pieces
-// that mend bare line ends are gathered first so that they do not cost a write each.
+// that mend bare line ends are gathered first so that they do not cost a write each. Staged
+// bytes always go out before a run that bypasses the staging, so the order is the input's.
 class OutputFile {
 public:
     OutputFile() : staging_(kStagingSize) {}
@@ -42,8 +43,8 @@ public:
     }
 
     bool write(const char* bytes, std::size_t count) {
+        if (count >= staging_.size() / 2) return flush() && put(bytes, count);
         if (used_ + count > staging_.size() && !flush()) return false;
-        if (count >= staging_.size() / 2) return put(bytes, count);
         std::memcpy(staging_.data() + used_, bytes, count);
         used_ += count;
         return true;
