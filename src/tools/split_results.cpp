@@ -5,10 +5,9 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <cstdio>
 #include <cstring>
 #include <string_view>
-#include <system_error>
+#include <utility>
 #include <vector>
 
 #include "core/app_folder.hpp"
@@ -18,16 +17,15 @@
 namespace tarn {
 namespace {
 
-constexpr std::size_t kStagingSize = 64 * 1024;
-
-
 // One output file. Runs of whole records go to the system as they stand; the small pieces
-// that mend bare line ends are gathered first so that they do not cost a write each.
+// that mend bare line ends are gathered first so that they do not cost a write each. Staged
+// bytes always go out before a run that bypasses the staging, so the order is the input's.
 class OutputFile {
 public:
-    OutputFile() : staging_(kStagingSize) {}
+    explicit OutputFile(const SplitWriteFunction& writeSome)
+        : writeSome_(writeSome), staging_(kSplitStagingSize) {}
     ~OutputFile() {
-        if (file_) std::fclose(file_);
+        if (fd_ >= 0) ::close(fd_);
     }
     OutputFile(const OutputFile&) = delete;
     OutputFile& operator=(const OutputFile&) = delete;
@@ -35,15 +33,13 @@ public:
     bool open(std::string name) {
         name_ = std::move(name);
         errno = 0;
-        file_ = std::fopen(name_.c_str(), "wb");
-        if (!file_) return fail(errno);
-        std::setvbuf(file_, nullptr, _IONBF, 0);
-        return true;
+        fd_ = ::open(name_.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666);
+        return fd_ >= 0 || fail(errno);
     }
 
     bool write(const char* bytes, std::size_t count) {
+        if (count >= staging_.size() / 2) return flush() && put(bytes, count);
         if (used_ + count > staging_.size() && !flush()) return false;
-        if (count >= staging_.size() / 2) return put(bytes, count);
         std::memcpy(staging_.data() + used_, bytes, count);
         used_ += count;
         return true;
@@ -51,10 +47,10 @@ public:
 
     bool close() {
         bool ok = flush();
-        if (file_) {
+        if (fd_ >= 0) {
             errno = 0;
-            if (std::fclose(file_) != 0 && ok) ok = fail(errno);
-            file_ = nullptr;
+            if (::close(fd_) != 0 && ok) ok = fail(errno);
+            fd_ = -1;
         }
         return ok;
     }
@@ -67,9 +63,19 @@ private:
         used_ = 0;
         return count == 0 || put(staging_.data(), count);
     }
+    // The system may take less than asked (a full disk, a signal): the rest is offered again
+    // until it is all written or the system refuses with a reason.
     bool put(const char* bytes, std::size_t count) {
-        errno = 0;
-        if (std::fwrite(bytes, 1, count, file_) != count) return fail(errno);
+        while (count > 0) {
+            errno = 0;
+            const ssize_t done =
+                writeSome_ ? writeSome_(fd_, bytes, count) : ::write(fd_, bytes, count);
+            if (done < 0 && errno == EINTR) continue;
+            // A write that takes nothing would be offered again forever.
+            if (done <= 0) return fail(done < 0 ? errno : 0);
+            bytes += done;
+            count -= static_cast<std::size_t>(done);
+        }
         return true;
     }
     bool fail(int err) {
@@ -77,7 +83,8 @@ private:
         return false;
     }
 
-    std::FILE* file_ = nullptr;
+    const SplitWriteFunction& writeSome_;
+    int fd_ = -1;
     std::string name_;
     std::string error_;
     std::vector<char> staging_;
@@ -129,7 +136,11 @@ class Splitter {
 public:
     Splitter(std::string prefix, std::int64_t recordsPerFile, const StopSignal& stop,
              const SplitOptions& options)
-        : prefix_(std::move(prefix)), perFile_(recordsPerFile), stop_(stop), options_(options) {}
+        : prefix_(std::move(prefix)),
+          perFile_(recordsPerFile),
+          stop_(stop),
+          options_(options),
+          out_(options.writeSome) {}
 
     SplitResult run(const std::string& resultsPath);
 

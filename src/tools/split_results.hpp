@@ -14,6 +14,14 @@
 namespace tarn {
 
 inline constexpr std::size_t kSplitBlockSize = std::size_t{1} << 20;
+// Small pieces for one output file are gathered up to this many bytes; pieces of half of it
+// or more go to the system directly.
+inline constexpr std::size_t kSplitStagingSize = std::size_t{64} << 10;
+
+// Writes up to count bytes to the descriptor like the system's write: the bytes taken, or -1
+// with errno set.
+using SplitWriteFunction =
+    std::function<std::ptrdiff_t(int fd, const char* bytes, std::size_t count)>;
 
 // The folder text as shown to the user, a separator and "primes", joined as they stand:
 // a root that already ends in the separator gives a doubled one ("/" gives "//primes").
@@ -34,6 +42,9 @@ struct SplitOptions {
     // Called at every point where the split looks at the stop signal, with the number of
     // records copied so far; lets a caller show progress or raise the stop at an exact record.
     std::function<void(std::int64_t)> onCheckpoint;
+    // Takes the place of the system's write for the output files (empty: the system's own);
+    // lets tests take a few bytes at a time or fail at a chosen byte.
+    SplitWriteFunction writeSome;
 };
 
 // Copies every record of resultsPath unchanged, each line ended by CR LF, into files named
