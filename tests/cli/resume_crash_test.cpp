@@ -41,18 +41,21 @@ TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
             const auto checkpoint = readCheckpoint(folder.path() + "primes.ini");
             const bool resume = checkpoint && checkpoint->interrupted == 1;
             resumes += resume;
-            CliChild child(
-                resume ? std::vector<std::string>{"--folder", folder.path(), "resume", interval}
-                       : std::vector<std::string>{"--folder", folder.path(), "generate", limit,
-                                                  interval},
-                output.path());
+            // One sieving thread, two, and more than the cores, in turn.
+            const std::string threads = "--threads=" + std::to_string((run + attempt) % 3 * 2 + 1);
+            CliChild child(resume ? std::vector<std::string>{"--folder", folder.path(), "resume",
+                                                             interval, threads}
+                                  : std::vector<std::string>{"--folder", folder.path(), "generate",
+                                                             limit, interval, threads},
+                           output.path());
             const bool kill = attempt < 4;  // then let it run to its end
             if (kill) {
                 std::this_thread::sleep_for(std::chrono::milliseconds(killDelay(random)));
                 child.signal(SIGKILL);
             }
             const int code = child.wait();
-            history += std::string(resume ? " resume:" : " generate:") + std::to_string(code);
+            history += std::string(resume ? " resume " : " generate ") + threads + ":" +
+                       std::to_string(code);
             completed = code == 0;
             ASSERT_TRUE(completed || (kill && code == 128 + SIGKILL))
                 << "seed " << seed << ", run " << run << history << ": " << child.err();

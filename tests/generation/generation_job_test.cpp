@@ -45,25 +45,39 @@ void expectComplete(const JobRun& r, std::int64_t limit, bool enumerated) {
     EXPECT_EQ(r.result.primeCount, primeCount(limit));
 }
 
-void expectComplete(std::int64_t limit, bool enumerated, const JobHooks& hooks = {}) {
-    SCOPED_TRACE("limit " + std::to_string(limit) + (enumerated ? " enumerated" : " plain"));
+void expectComplete(std::int64_t limit, bool enumerated, int threads, const JobHooks& hooks = {}) {
+    SCOPED_TRACE("limit " + std::to_string(limit) + (enumerated ? " enumerated " : " plain ") +
+                 std::to_string(threads) + " threads");
     TempFolder folder;
-    expectComplete(runIn(folder, JobSpec{"", limit, enumerated}, hooks), limit, enumerated);
+    JobSpec spec{"", limit, enumerated};
+    spec.threads = threads;
+    expectComplete(runIn(folder, spec, hooks), limit, enumerated);
 }
 
 TEST(GenerationJob, CompleteRunsMatchTheOracle) {
     // Limits at and around the ends of wheel turns (30k + 7, 30k + 11).
+    int threads = 0;
     for (const std::int64_t limit :
          {100, 110, 997, 1000, 1206, 1207, 1208, 1210, 1211, 1212, 30 * 331 + 7, 30 * 331 + 11})
-        for (const bool enumerated : {false, true}) expectComplete(limit, enumerated);
-    // The first batch is one turn and the next 32768 turns; its end is turn 32769.
-    const std::int64_t edge = 30 * 32769 + 11;
-    for (const std::int64_t limit : {edge - 1, edge, edge + 1, edge + 30})
-        expectComplete(limit, false);
+        for (const bool enumerated : {false, true})
+            expectComplete(limit, enumerated, threads++ % 3 + 1);
+    // The first batch is one turn, the next ones 32768 turns, a chunk 8 batches: edges of the
+    // first batch, the first chunk and the second.
+    for (const std::int64_t turns : {32769, 8 * 32768, 16 * 32768}) {
+        const std::int64_t edge = 30 * turns + 11;
+        for (const std::int64_t limit : {edge - 1, edge, edge + 1, edge + 30})
+            expectComplete(limit, limit % 2 == 0, threads++ % 3 + 1);
+    }
+    // Many small chunks for more threads than cores, each waiting for the serial numbers of the
+    // one before.
+    JobHooks small;
+    small.turnsPerBatch = 7;
+    small.turnsPerChunk = 50;
+    for (const int many : {2, 3, 8}) expectComplete(300'007, true, many, small);
     std::mt19937_64 random(20240601);
     std::uniform_int_distribution<std::int64_t> pick(100, 10'000'000);
-    for (int i = 0; i < 4; ++i) expectComplete(pick(random), i % 2 == 1);
-    expectComplete(10'000'000, false);
+    for (int i = 0; i < 4; ++i) expectComplete(pick(random), i % 2 == 1, i % 3 + 1);
+    expectComplete(10'000'000, false, 2);
 }
 
 // A job stopped after `turns` turns (0: a stop asked before the start, which still lets the first
@@ -90,6 +104,7 @@ TEST(GenerationJob, StoppedAndContinuedJobsGiveTheFileOfOneRun) {
                 hooks.afterBatch = [&stop, stopAt](std::int64_t done) {
                     if (stopAt >= 0 && done >= stopAt) stop.request();
                 };
+                spec.threads = 1;  // the stop lands exactly after the batch that asks for it
                 const JobRun r = runIn(folder, spec, hooks, stop);
                 if (stopAt < 0 || last + 4 > limit) {
                     expectComplete(r, limit, enumerated);
@@ -103,6 +118,40 @@ TEST(GenerationJob, StoppedAndContinuedJobsGiveTheFileOfOneRun) {
                 spec = {"", limit, enumerated, true, last + 4, r.result.primeCount};
                 last += 30 * 7;
             }
+        }
+    }
+}
+
+// With several threads a stop raised by one of them lands where the earliest chunk in progress
+// ends, possibly before chunks that other threads have finished: the file still ends on the last
+// whole turn written, the checkpoint and count say so, and a continued job completes the file.
+TEST(GenerationJob, StopsAmongSeveralThreadsLandOnAWholeTurn) {
+    const std::int64_t limit = 200'000;
+    for (const int threads : {2, 3, 8}) {
+        for (const std::int64_t stopAt : {1, 40, 333, 1000, 5000}) {
+            SCOPED_TRACE(std::to_string(threads) + " threads, stop at " + std::to_string(stopAt));
+            const bool enumerated = (threads + stopAt) % 2 == 1;
+            TempFolder folder;
+            StopSignal stop;
+            JobHooks hooks;
+            hooks.turnsPerBatch = 5;
+            hooks.turnsPerChunk = 40;
+            hooks.afterBatch = [&stop, stopAt](std::int64_t turns) {
+                if (turns >= stopAt) stop.request();
+            };
+            JobSpec spec{"", limit, enumerated};
+            spec.threads = threads;
+            const JobRun r = runIn(folder, spec, hooks, stop);
+            ASSERT_EQ(r.result.status, Status::Stopped);
+            const std::int64_t last = r.result.candidate;
+            EXPECT_EQ(last % 30, 7);
+            EXPECT_GE(last, 37);
+            EXPECT_TRUE(sameText(r.results, oracleResults(last, enumerated)));
+            EXPECT_EQ(r.checkpoint, oracleCheckpoint(last, limit, 1));
+            EXPECT_EQ(r.result.primeCount, primeCount(last));
+            JobSpec rest{"", limit, enumerated, true, last + 4, r.result.primeCount};
+            rest.threads = threads;
+            expectComplete(runIn(folder, rest), limit, enumerated);
         }
     }
 }
@@ -126,7 +175,9 @@ TEST(GenerationJob, CheckpointsDuringTheJobAgreeWithTheFile) {
             << "file at " << c.candidate;
     };
     // Small batches and small buffers also hand many partial buffers to the writer.
-    expectComplete(runIn(folder, JobSpec{"", 2'000'000, true}, hooks), 2'000'000, true);
+    JobSpec spec{"", 2'000'000, true};
+    spec.threads = 3;
+    expectComplete(runIn(folder, spec, hooks), 2'000'000, true);
     EXPECT_GE(seen, 2);
 }
 
