@@ -7,7 +7,6 @@
 #include <cerrno>
 #include <cstring>
 
-#include "core/app_folder.hpp"
 #include "core/entry.hpp"
 #include "core/file_messages.hpp"
 #include "generation/checkpoint_file.hpp"
@@ -44,8 +43,11 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
     const std::string checkpointPath = folder + kCheckpointFileName;
     const std::string resultsPath = folder + kResultsFileName;
 
-    if (!FileExists(checkpointPath)) return {};
-    const auto checkpoint = readCheckpoint(checkpointPath);
+    const CheckpointRead read = readCheckpoint(checkpointPath);
+    if (read.status == CheckpointRead::Status::Missing) return {};
+    if (read.status == CheckpointRead::Status::Unreadable)
+        return refused(checkpointReadRefusal(checkpointPath, systemReason(read.error)));
+    const auto& checkpoint = read.checkpoint;
     if (!checkpoint) return refused(unreadableCheckpointRefusal(checkpointPath));
     if (checkpoint->interrupted != 1) return {};
     const std::int64_t resumePoint = checkpoint->candidate;
