@@ -6,23 +6,13 @@
 #include <cstdio>
 #include <string_view>
 
+#include "cli/standard_output.hpp"
 #include "core/entry.hpp"
 
 namespace tarn::cli {
 namespace {
 
 constexpr std::size_t kFlushSize = 1 << 16;
-
-void writeAll(int fd, std::string_view data) {
-    while (!data.empty()) {
-        const ssize_t written = ::write(fd, data.data(), data.size());
-        if (written < 0) {
-            if (errno == EINTR) continue;
-            return;  // a closed pipe: nothing more can be said
-        }
-        data.remove_prefix(static_cast<std::size_t>(written));
-    }
-}
 
 class Batch {
 public:
@@ -36,15 +26,14 @@ public:
         if (ctx_.stop.requested()) return stopped();
         const EntryResult result = ReadNumberEntry(text, '.');
         if (!result.accepted()) {
-            flush();  // keep the message next to the lines it follows
+            if (!flush()) return false;  // keep the message next to the lines it follows
             std::string message = result.message + '\n';
             writeAll(STDERR_FILENO, message);
             refused_ = true;
             return true;
         }
         if (!work_(result.number->whole(), out_)) return stopped();
-        if (out_.size() >= kFlushSize) flush();
-        return true;
+        return out_.size() < kFlushSize || flush();
     }
 
     bool stopped() {
@@ -52,11 +41,16 @@ public:
         return false;
     }
 
-    int exitCode() const { return stopped_ ? kStopped : refused_ ? kRefused : kOk; }
+    // A failed write outranks the rest: the main program tells its reason.
+    int exitCode() const {
+        return failed_ ? kIoFailure : stopped_ ? kStopped : refused_ ? kRefused : kOk;
+    }
 
-    void flush() {
-        writeAll(STDOUT_FILENO, out_);
+    // False when standard output could not take the lines: the batch ends there.
+    bool flush() {
+        failed_ = !writeStandardOutput(out_);
         out_.clear();
+        return !failed_;
     }
 
 private:
@@ -65,6 +59,7 @@ private:
     std::string out_;
     bool refused_ = false;
     bool stopped_ = false;
+    bool failed_ = false;
 };
 
 // Feeds every line of standard input to the batch. Blank lines are passed over; a carriage

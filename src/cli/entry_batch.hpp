@@ -18,7 +18,8 @@ namespace tarn::cli {
 // false when the work was stopped.
 using EntryWork = std::function<bool(std::int64_t number, std::string& out)>;
 
-// kOk, kRefused when any entry was refused, kStopped when ctx.stop ended the batch.
+// kOk, kRefused when any entry was refused, kStopped when ctx.stop ended the batch, kIoFailure
+// when standard output could not be written (the batch ends at that block).
 int runEntryBatch(Context& ctx, const std::vector<std::string>& arguments, const EntryWork& work);
 
 }  // namespace tarn::cli

@@ -8,6 +8,7 @@
 #include <string>
 
 #include "cli/cli_context.hpp"
+#include "cli/standard_output.hpp"
 #include "core/command_texts.hpp"
 #include "generation/job_texts.hpp"
 
@@ -67,7 +68,7 @@ void ProgressLine::run() {
 int reportJob(const JobResult& result) {
     switch (result.status) {
         case JobResult::Status::Completed:
-            std::cout << completionReport(result) << '\n';
+            writeStandardOutput(completionReport(result) + '\n');
             return kOk;
         case JobResult::Status::Stopped:
             std::cerr << kAllStoppedMessage << '\n';

@@ -1,12 +1,17 @@
 // tarn-cli: the command-line front end over the same engine as the desktop program.
 #include <CLI/CLI.hpp>
+#include <iostream>
+#include <sstream>
 
 #include "cli/cli_context.hpp"
+#include "cli/standard_output.hpp"
 #include "core/app_folder.hpp"
 #include "core/data_folder.hpp"
 #include "core/exception_text.hpp"
 
-int main(int argc, char** argv) {
+namespace {
+
+int run(int argc, char** argv) {
     tarn::StopSignal stop;
     tarn::cli::Context ctx{{}, stop};
     const std::string programFolder = tarn::AppFolder();
@@ -34,7 +39,10 @@ int main(int argc, char** argv) {
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& e) {
-        const int code = app.exit(e);
+        // --help and --version: their text goes out like every other, so a failed write shows.
+        std::ostringstream out;
+        const int code = app.exit(e, out, std::cerr);
+        tarn::cli::writeStandardOutput(out.str());
         return code == 0 ? 0 : tarn::cli::kRefused;
     } catch (...) {
         // The engines report their own failures; this is the last line for anything else.
@@ -42,8 +50,12 @@ int main(int argc, char** argv) {
         return tarn::cli::kIoFailure;
     }
     if (argc == 1) {
-        std::cout << app.help();
+        tarn::cli::writeStandardOutput(app.help());
         return 0;
     }
     return ctx.exitCode;
 }
+
+}  // namespace
+
+int main(int argc, char** argv) { return tarn::cli::finishStandardOutput(run(argc, argv)); }

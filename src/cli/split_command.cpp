@@ -4,6 +4,7 @@
 #include <iostream>
 
 #include "cli/cli_context.hpp"
+#include "cli/standard_output.hpp"
 #include "generation/file_names.hpp"
 #include "tools/split_entry.hpp"
 #include "tools/split_results.hpp"
@@ -28,7 +29,7 @@ int runSplit(const SplitArguments& args, Context& ctx) {
         std::cerr << r.message << '\n';
         return kIoFailure;
     }
-    std::cout << splitDoneMessage(r.files) << '\n';
+    writeStandardOutput(splitDoneMessage(r.files) + '\n');
     return r.status == SplitStatus::Stopped ? kStopped : kOk;
 }
 

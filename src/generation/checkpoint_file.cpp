@@ -6,8 +6,6 @@
 #include <cerrno>
 #include <climits>
 #include <cstring>
-#include <fstream>
-#include <iterator>
 
 #include "core/file_messages.hpp"
 
@@ -52,6 +50,28 @@ int syncFolderOf(const std::string& path) {
     return error;
 }
 
+// The whole file into `text`; the system's error number, or 0 once it is read. Opened without
+// waiting, so that a pipe in the file's place cannot hold up the program.
+int readWholeFile(const std::string& path, std::string& text) {
+    const int fd = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
+    if (fd < 0) return errno;
+    int error = 0;
+    char block[4096];
+    for (;;) {
+        const ssize_t got = ::read(fd, block, sizeof block);
+        if (got > 0) {
+            text.append(block, static_cast<std::size_t>(got));
+        } else if (got == 0) {
+            break;
+        } else if (errno != EINTR) {
+            error = errno;  // a folder in the file's place gives EISDIR here
+            break;
+        }
+    }
+    ::close(fd);
+    return error;
+}
+
 }  // namespace
 
 std::string checkpointLine(const Checkpoint& c) {
@@ -65,20 +85,23 @@ std::string checkpointLine(const Checkpoint& c) {
     return line;
 }
 
-std::optional<Checkpoint> readCheckpoint(const std::string& path) {
-    std::ifstream in(path, std::ios::binary);
-    if (!in) return std::nullopt;
-    const std::string text{std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>()};
+CheckpointRead readCheckpoint(const std::string& path) {
+    using Status = CheckpointRead::Status;
+    std::string text;
+    const int error = readWholeFile(path, text);
+    if (error == ENOENT) return {.status = Status::Missing};
+    if (error != 0) return {.status = Status::Unreadable, .error = error};
     // Candidate and Limit are whole Numbers; Interrupted is a 16-bit integer.
     constexpr std::int64_t kMaxWhole = INT64_MAX / 10000;
     std::size_t pos = 0;
     const auto candidate = nextNumber(text, pos, -kMaxWhole - 1, kMaxWhole);
-    if (!candidate) return std::nullopt;
+    if (!candidate) return {.status = Status::Malformed};
     const auto limit = nextNumber(text, pos, -kMaxWhole - 1, kMaxWhole);
-    if (!limit) return std::nullopt;
+    if (!limit) return {.status = Status::Malformed};
     const auto interrupted = nextNumber(text, pos, SHRT_MIN, SHRT_MAX);
-    if (!interrupted) return std::nullopt;
-    return Checkpoint{*candidate, *limit, static_cast<int>(*interrupted)};
+    if (!interrupted) return {.status = Status::Malformed};
+    return {.status = Status::Read,
+            .checkpoint = Checkpoint{*candidate, *limit, static_cast<int>(*interrupted)}};
 }
 
 std::string writeCheckpoint(const std::string& path, const Checkpoint& checkpoint) {

@@ -24,9 +24,21 @@ inline constexpr Checkpoint kFreshCheckpoint{101, 100, 0};
 // The exact bytes of the line: " 101  100  0 \r\n".
 std::string checkpointLine(const Checkpoint& checkpoint);
 
-// Reads the three numbers; nothing when the file is missing, unreadable, has fewer than three
-// numbers, or a number too large for its field.
-std::optional<Checkpoint> readCheckpoint(const std::string& path);
+// What reading the checkpoint found. Only a missing or malformed file may be replaced: one that
+// could not be read may still hold a job that can be resumed.
+struct CheckpointRead {
+    enum class Status {
+        Read,        // `checkpoint` holds the three numbers
+        Missing,     // no file of that name
+        Malformed,   // fewer than three numbers, or a number too large for its field
+        Unreadable,  // the file is there but could not be read: `error` says why
+    };
+    Status status = Status::Missing;
+    std::optional<Checkpoint> checkpoint{};  // set exactly when Read
+    int error = 0;                           // the system's error number when Unreadable
+};
+
+CheckpointRead readCheckpoint(const std::string& path);
 
 // Writes the line durably through a temporary file and a rename. Returns an empty text on
 // success, otherwise the system's reason.

@@ -7,7 +7,6 @@
 #include <cerrno>
 #include <cstring>
 
-#include "core/app_folder.hpp"
 #include "core/entry.hpp"
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
@@ -66,8 +65,11 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     const std::string checkpointPath = folder + kCheckpointFileName;
     const std::string resultsPath = folder + kResultsFileName;
 
-    if (!FileExists(checkpointPath)) return {};
-    const auto checkpoint = readCheckpoint(checkpointPath);
+    const CheckpointRead read = readCheckpoint(checkpointPath);
+    if (read.status == CheckpointRead::Status::Missing) return {};
+    if (read.status == CheckpointRead::Status::Unreadable)
+        return refused(checkpointReadRefusal(checkpointPath, systemReason(read.error)));
+    const auto& checkpoint = read.checkpoint;
     if (!checkpoint) return refused(unreadableCheckpointRefusal(checkpointPath));
     if (checkpoint->interrupted != 1) return {};
     const std::int64_t resumePoint = checkpoint->candidate;

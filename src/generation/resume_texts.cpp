@@ -12,6 +12,11 @@ std::string unreadableCheckpointRefusal(const std::string& path) {
            " does not hold three readable numbers." + std::string(kNothingChanged);
 }
 
+std::string checkpointReadRefusal(const std::string& path, const std::string& reason) {
+    return "Impossible to resume: the checkpoint file " + path + " cannot be read (" + reason +
+           ")." + std::string(kNothingChanged);
+}
+
 std::string misalignedCheckpointRefusal(const std::string& path, std::int64_t resumePoint) {
     return "Impossible to resume: the checkpoint file " + path + " names " +
            std::to_string(resumePoint) +

@@ -27,7 +27,9 @@ inline constexpr std::string_view kDoingResumeInfoLine = "INFO: Doing resume..."
 inline constexpr std::string_view kNothingToResumeNote = "Nothing to resume.";
 
 // Refusals of files that cannot be continued. Every one ends by saying that nothing changed.
+// A checkpoint without its three numbers, then one that could not be read at all.
 std::string unreadableCheckpointRefusal(const std::string& path);
+std::string checkpointReadRefusal(const std::string& path, const std::string& reason);
 std::string misalignedCheckpointRefusal(const std::string& path, std::int64_t resumePoint);
 std::string limitOutOfRangeRefusal(const std::string& path, std::int64_t limit);
 std::string unreadableResultsRefusal(const std::string& path, const std::string& reason);

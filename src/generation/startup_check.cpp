@@ -2,7 +2,7 @@
 // user actually resumes.
 #include "generation/startup_check.hpp"
 
-#include "core/app_folder.hpp"
+#include "core/file_messages.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/file_names.hpp"
 
@@ -10,14 +10,22 @@ namespace tarn {
 
 StartupCheck checkCheckpointAtStartup(const std::string& folder) {
     const std::string path = folder + kCheckpointFileName;
-    const auto checkpoint = FileExists(path) ? readCheckpoint(path) : std::nullopt;
-    if (!checkpoint) {
-        // Nothing is reported when this fails too (a read-only folder): start-up goes on, and
-        // the next job's checkpoint write reports the problem.
-        writeCheckpoint(path, kFreshCheckpoint);
-        return {};
+    const CheckpointRead read = readCheckpoint(path);
+    switch (read.status) {
+        case CheckpointRead::Status::Unreadable:
+            return {.readFailure = fileReadFailure(path, systemReason(read.error))};
+        case CheckpointRead::Status::Missing:
+        case CheckpointRead::Status::Malformed:
+            // Nothing is reported when this fails too (a read-only folder): start-up goes on,
+            // and the next job's checkpoint write reports the problem.
+            writeCheckpoint(path, kFreshCheckpoint);
+            return {};
+        case CheckpointRead::Status::Read:
+            break;
     }
-    return {checkpoint->interrupted == 1 && checkpoint->candidate < checkpoint->limit};
+    const Checkpoint& checkpoint = *read.checkpoint;
+    return {.showInterruptedPrompt =
+                checkpoint.interrupted == 1 && checkpoint.candidate < checkpoint.limit};
 }
 
 }  // namespace tarn

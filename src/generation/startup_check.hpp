@@ -8,9 +8,13 @@ namespace tarn {
 
 struct StartupCheck {
     bool showInterruptedPrompt = false;  // show kInterruptedPrompt (resume_texts.hpp)
+    // "The file <path> could not be read: <reason>." when the checkpoint is there but could not
+    // be read; shown as an "Info" message. Empty otherwise.
+    std::string readFailure{};
 };
 
-// A missing or unreadable checkpoint is replaced by the fresh one (101, 100, 0) without a word.
+// A missing or malformed checkpoint is replaced by the fresh one (101, 100, 0) without a word.
+// One that could not be read is left as it is, since it may still name a job to resume.
 StartupCheck checkCheckpointAtStartup(const std::string& folder);
 
 }  // namespace tarn

@@ -25,7 +25,9 @@ constexpr int kBarSteps = 1'000'000;
 
 void Form1::Form_Load() {
     closingRequested_ = false;
-    if (checkCheckpointAtStartup(folder_).showInterruptedPrompt)
+    const StartupCheck check = checkCheckpointAtStartup(folder_);
+    if (!check.readFailure.empty()) messages_.show(check.readFailure, std::string(kInfoTitle));
+    if (check.showInterruptedPrompt)
         messages_.show(std::string(kInterruptedPrompt), std::string(kInfoTitle));
 }
 

@@ -20,9 +20,10 @@ namespace tarn::test {
 class CliChild {
 public:
     // Starts TARN_CLI_PATH with `args`; stdout and stderr go to files in `outputFolder`, and
-    // standard input comes from `inputPath` when one is given.
+    // standard input comes from `inputPath` when one is given. Standard output goes to
+    // `stdoutPath` instead (such as /dev/full) when one is given.
     CliChild(std::vector<std::string> args, const std::string& outputFolder,
-             const std::string& inputPath = "")
+             const std::string& inputPath = "", const std::string& stdoutPath = "")
         : outPath_(outputFolder + "cli.out"), errPath_(outputFolder + "cli.err") {
         args.insert(args.begin(), TARN_CLI_PATH);
         std::vector<char*> argv;
@@ -32,9 +33,10 @@ public:
         posix_spawn_file_actions_init(&actions);
         if (!inputPath.empty())
             posix_spawn_file_actions_addopen(&actions, 0, inputPath.c_str(), O_RDONLY, 0);
-        for (const auto& [fd, path] : {std::pair{1, &outPath_}, std::pair{2, &errPath_}})
-            posix_spawn_file_actions_addopen(&actions, fd, path->c_str(),
-                                             O_WRONLY | O_CREAT | O_TRUNC, 0644);
+        const std::string& stdoutTarget = stdoutPath.empty() ? outPath_ : stdoutPath;
+        for (const auto& [fd, path] : {std::pair{1, stdoutTarget.c_str()}, {2, errPath_.c_str()}})
+            posix_spawn_file_actions_addopen(&actions, fd, path, O_WRONLY | O_CREAT | O_TRUNC,
+                                             0644);
         if (posix_spawn(&pid_, argv[0], &actions, nullptr, argv.data(), environ) != 0) pid_ = -1;
         posix_spawn_file_actions_destroy(&actions);
     }
@@ -53,7 +55,7 @@ public:
     }
     // Whether it has ended, without waiting for it.
     bool finished() { return reap(WNOHANG); }
-    std::string out() const { return readFile(outPath_); }
+    std::string out() const { return readFile(outPath_); }  // "" when stdout went elsewhere
     std::string err() const { return readFile(errPath_); }
 
 private:
@@ -82,9 +84,9 @@ inline void PrintTo(const CliRun& run, std::ostream* os) {
 
 // Runs the program to its end, with `input` on standard input.
 inline CliRun runCli(const std::vector<std::string>& args, const std::string& outputFolder,
-                     const std::string& input = "") {
+                     const std::string& input = "", const std::string& stdoutPath = "") {
     writeFile(outputFolder + "cli.in", input);
-    CliChild child(args, outputFolder, outputFolder + "cli.in");
+    CliChild child(args, outputFolder, outputFolder + "cli.in", stdoutPath);
     const int code = child.wait();
     return {code, child.out(), child.err()};
 }

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <chrono>
+#include <filesystem>
 #include <string>
 #include <thread>
 
@@ -36,6 +37,34 @@ TEST(CliNumbers, OneLineEachOnStdoutRefusalsOnStderr) {
                       "Number 127 is prime.\nNumber 9 is not prime.\nNumber 922337203685277 is "
                       "not prime.\n",
                       "Invalid entry.\n" + kRange}));
+}
+
+// Standard output on a full disk: every command that prints there ends with exit code 1 and the
+// system's reason, told once; a batch ends at the first block that could not be written, before
+// the refusal that follows it.
+TEST(CliNumbers, AFailedWriteOnStandardOutputExitsWithOne) {
+    if (!std::filesystem::exists("/dev/full")) GTEST_SKIP() << "no /dev/full";
+    std::string manyLines;  // more output than one block of the batch
+    for (int i = 0; i < 5000; ++i) manyLines += "97\n";
+    TempFolder files;  // generate writes primes.txt there, split reads it back
+    const std::pair<std::vector<std::string>, std::string> runs[] = {
+        {{"factorize", "360"}, ""},
+        {{"test", "97", "x"}, ""},
+        {{"factorize"}, "360\n"},
+        {{"test"}, manyLines + "x\n"},
+        {{}, ""},
+        {{"--help"}, ""},
+        {{"--version"}, ""},
+        {{"--folder", files.path(), "generate", "100"}, ""},
+        {{"--folder", files.path(), "split", "--records", "1000", "--into", files.path()}, ""}};
+    for (const auto& [args, input] : runs) {
+        TempFolder scratch;
+        EXPECT_EQ(runCli(args, scratch.path(), input, "/dev/full"),
+                  (CliRun{1, "",
+                          "The file standard output could not be written: No space left on "
+                          "device.\n"}))
+            << ::testing::PrintToString(args);
+    }
 }
 
 TEST(CliNumbers, InterruptEndsTheBatchWithExitCodeThree) {

@@ -38,7 +38,7 @@ TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
         bool completed = false;
         std::string history;  // the commands of this run and how each ended
         for (int attempt = 0; attempt < 30 && !completed; ++attempt) {
-            const auto checkpoint = readCheckpoint(folder.path() + "primes.ini");
+            const auto checkpoint = readCheckpoint(folder.path() + "primes.ini").checkpoint;
             const bool resume = checkpoint && checkpoint->interrupted == 1;
             resumes += resume;
             // One sieving thread, two, and more than the cores, in turn.

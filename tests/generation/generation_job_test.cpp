@@ -196,7 +196,7 @@ TEST(GenerationJobFailure, FailuresNameTheFileAndLeaveAContinuableCheckpoint) {
         EXPECT_THAT(failIn(folder.path(), 100'000).error,
                     StartsWith("The file " + folder.path() +
                                "primes.txt could not be written: No space left on device."));
-        EXPECT_EQ(readCheckpoint(folder.path() + "primes.ini")->interrupted, 0);
+        EXPECT_EQ(readCheckpoint(folder.path() + "primes.ini").checkpoint->interrupted, 0);
     }
     {
         TempFolder folder;

@@ -18,10 +18,12 @@ namespace {
 using namespace test;
 using Status = ResumeResult::Status;
 
-const std::string kNone = "<none>";  // a file that is not there
+const std::string kNone = "<none>";      // a file that is not there
+const std::string kFolder = "<folder>";  // a folder in the file's place: it cannot be read
 const std::string kGoodLine = " 37  1000  1 \r\n";
 
 std::string contents(const std::string& path) {
+    if (std::filesystem::is_directory(path)) return kFolder;
     return std::filesystem::exists(path) ? readFile(path) : kNone;
 }
 
@@ -35,7 +37,8 @@ struct Resume {
 
     Resume(const std::string& records, const std::string& checkpoint, const StopSignal& stop) {
         if (records != kNone) writeFile(resultsPath(), records);
-        if (checkpoint != kNone) writeFile(checkpointPath(), checkpoint);
+        if (checkpoint == kFolder) std::filesystem::create_directory(checkpointPath());
+        if (checkpoint != kNone && checkpoint != kFolder) writeFile(checkpointPath(), checkpoint);
         const ResumeEvents events{[this] { ++gathering; },
                                   [this](const ResumeStart&) { ++continuing; }};
         result = runResume(folder.path(), stop, nullptr, events);
@@ -110,6 +113,7 @@ TEST(ResumeJob, FilesThatCannotBeTrustedAreLeftUnchanged) {
         {"garbage", 'c', "three readable numbers", good, "garbage\r\n"},
         {"two numbers", 'c', "three readable numbers", good, " 37  1000 \r\n"},
         {"overflow", 'c', "three readable numbers", good, " 99999999999999999999  1000  1 \r\n"},
+        {"checkpoint is a folder", 'c', "cannot be read (Is a directory)", good, kFolder},
         {"not 30k+7", 'c', "30k + 7", good, oracleCheckpoint(38, 1000, 1)},
         {"negative candidate", 'c', "30k + 7", good, "-23  1000  1 \r\n"},
         {"limit out of range", 'c', "922337203685277", good,

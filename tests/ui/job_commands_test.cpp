@@ -1,6 +1,7 @@
 // Generate, Resume, start-up and closing in the window, over a fresh folder.
 #include <QSignalSpy>
 #include <csignal>
+#include <filesystem>
 
 #include "generation/checkpoint_file.hpp"
 #include "ui/termination_signals.hpp"
@@ -67,7 +68,7 @@ TEST_F(JobCommandTest, StopLeavesAResumableCheckpoint) {
     EXPECT_EQ(messages.last().text, "All calculations were stopped!");
     EXPECT_EQ(messages.last().title, "Command");
     EXPECT_EQ(c().Label5->text(), "INFO:");
-    const auto stopped = readCheckpoint(dir.path() + "primes.ini");
+    const auto stopped = readCheckpoint(dir.path() + "primes.ini").checkpoint;
     ASSERT_TRUE(stopped);
     EXPECT_EQ(stopped->candidate % 30, 7);
     EXPECT_EQ(stopped->limit, 900000000000);
@@ -115,6 +116,19 @@ TEST_F(JobCommandTest, StartUpTellsAboutAStoppedJobThatResumeContinues) {
     EXPECT_EQ(messages.last().title, "Info");
 }
 
+// A checkpoint that cannot be read (here a folder in its place) may still name a job to resume:
+// start-up leaves it and says why.
+TEST_F(JobCommandTest, StartUpTellsWhyItCannotReadTheCheckpointAndLeavesIt) {
+    const std::string checkpoint = dir.path() + "primes.ini";
+    std::filesystem::create_directory(checkpoint);
+    window->Form_Load();
+    ASSERT_EQ(messages.shown.size(), 1u);
+    EXPECT_EQ(messages.last().text,
+              "The file " + checkpoint + " could not be read: Is a directory.");
+    EXPECT_EQ(messages.last().title, "Info");
+    EXPECT_TRUE(std::filesystem::is_directory(checkpoint));
+}
+
 TEST_F(JobCommandTest, ClosingDuringAJobStopsItQuietlyWithACheckpoint) {
     // SIGTERM closes the window like the user does.
     ui::closeOnTerminationSignals(*window);
@@ -127,7 +141,7 @@ TEST_F(JobCommandTest, ClosingDuringAJobStopsItQuietlyWithACheckpoint) {
     EXPECT_FALSE(window->jobRunning());
     EXPECT_FALSE(window->isVisible());
     EXPECT_TRUE(messages.shown.empty());
-    const auto stopped = readCheckpoint(dir.path() + "primes.ini");
+    const auto stopped = readCheckpoint(dir.path() + "primes.ini").checkpoint;
     ASSERT_TRUE(stopped);
     EXPECT_EQ(stopped->interrupted, 1);
     // Every prime up to the checkpoint is in the file, and none beyond.

@@ -1,0 +1,46 @@
+#include "cli/standard_output.hpp"
+
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <string>
+
+#include "cli/cli_context.hpp"
+#include "core/file_messages.hpp"
+
+namespace tarn::cli {
+namespace {
+// The first failure's error number: later writes would only repeat it, or garble the output.
+int g_failure = 0;
+}  // namespace
+
+int writeAll(int fd, std::string_view text) {
+    while (!text.empty()) {
+        const ssize_t written = ::write(fd, text.data(), text.size());
+        if (written < 0) {
+            if (errno == EINTR) continue;
+            return errno;
+        }
+        text.remove_prefix(static_cast<std::size_t>(written));
+    }
+    return 0;
+}
+
+bool writeStandardOutput(std::string_view text) {
+    if (g_failure == 0) g_failure = writeAll(STDOUT_FILENO, text);
+    return g_failure == 0;
+}
+
+int finishStandardOutput(int code) {
+    // Nothing of tarn-cli's own goes through stdout's buffer; a library might have written there.
+    errno = 0;
+    if (g_failure == 0 && (std::fflush(stdout) != 0 || std::ferror(stdout)))
+        g_failure = errno != 0 ? errno : EIO;
+    if (g_failure == 0) return code;
+    const std::string message = fileWriteFailure("standard output", systemReason(g_failure)) + '\n';
+    writeAll(STDERR_FILENO, message);
+    return kIoFailure;
+}
+
+}  // namespace tarn::cli
