@@ -9,6 +9,9 @@
 
 #include <ostream>
 #include <string>
+#include <chrono>
+#include <filesystem>
+#include <thread>
 #include <vector>
 
 #include "support/temp_folder.hpp"
@@ -47,6 +50,14 @@ public:
     CliChild& operator=(const CliChild&) = delete;
 
     void signal(int number) { ::kill(pid_, number); }
+
+    // Waits until the child has written something to standard output, so that a signal lands
+    // inside its work however slowly the program starts (sanitizer builds on a busy machine).
+    void waitForOutput() const {
+        const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+        while (std::filesystem::file_size(outPath_) == 0 && std::chrono::steady_clock::now() < until)
+            std::this_thread::sleep_for(std::chrono::milliseconds(2));
+    }
 
     // The exit code, or 128 + the signal that ended it; -1 when the program did not start.
     int wait() {
