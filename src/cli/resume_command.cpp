@@ -19,6 +19,8 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
     auto hooks = std::make_shared<JobHooks>();
     addCheckpointIntervalOption(*command, *hooks);
     command->callback([&ctx, hooks] {
+        const auto lock = lockFolder(ctx);
+        if (!lock) return;
         JobProgress progress;
         std::optional<ProgressLine> line;
         ResumeEvents events;
