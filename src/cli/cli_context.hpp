@@ -2,8 +2,10 @@
 // the stop request raised by Ctrl-C or SIGTERM, and the exit code the command leaves.
 #pragma once
 
+#include <optional>
 #include <string>
 
+#include "core/folder_lock.hpp"
 #include "core/stop_signal.hpp"
 
 namespace CLI {
@@ -26,6 +28,11 @@ void registerNumberCommands(CLI::App& app, Context& ctx);
 void registerGenerationCommands(CLI::App& app, Context& ctx);
 void registerSplitCommand(CLI::App& app, Context& ctx);
 void registerResumeCommand(CLI::App& app, Context& ctx);
+
+// The folder's lock, taken before a job, resume or split and held until it has ended. Nothing
+// when another job holds it: the refusal is on stderr and the exit code is kRefused. A folder
+// that cannot be locked at all is left to the command, which reports its own file errors.
+std::optional<FolderLock> lockFolder(Context& ctx);
 
 // Raises `stop` on SIGINT and SIGTERM.
 void installInterruptHandler(StopSignal& stop);

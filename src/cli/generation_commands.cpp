@@ -44,6 +44,8 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
             ctx.exitCode = kRefused;
             return;
         }
+        const auto lock = lockFolder(ctx);
+        if (!lock) return;
         JobSpec spec;
         spec.folder = ctx.folder;
         spec.limit = entry.number->whole();

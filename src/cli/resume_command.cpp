@@ -21,6 +21,8 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
     addThreadsOption(*command, *threads);
     addCheckpointIntervalOption(*command, *hooks);
     command->callback([&ctx, hooks, threads] {
+        const auto lock = lockFolder(ctx);
+        if (!lock) return;
         JobProgress progress;
         std::optional<ProgressLine> line;
         ResumeEvents events;

@@ -23,6 +23,8 @@ int runSplit(const SplitArguments& args, Context& ctx) {
         std::cerr << count.message << '\n';
         return kRefused;
     }
+    const auto lock = lockFolder(ctx);
+    if (!lock) return kRefused;
     const SplitResult r = splitResultsFile(
         ctx.folder + kResultsFileName, splitNamePrefix(args.into), count.number->whole(), ctx.stop);
     if (r.status == SplitStatus::Failed) {

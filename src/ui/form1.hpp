@@ -11,6 +11,7 @@
 #include <memory>
 #include <string>
 
+#include "core/folder_lock.hpp"
 #include "core/stop_signal.hpp"
 #include "generation/generation_job.hpp"
 
@@ -24,6 +25,8 @@ class MessageBox;
 class Shell;
 
 inline constexpr const char* kMakerWebAddress = "https://brindle.example";
+inline constexpr const char* kJobWhileSplitMessage =
+    "A split is reading the results file. Start the calculation when the split has finished.";
 
 class Form1 : public QMainWindow {
     Q_OBJECT
@@ -83,6 +86,7 @@ private:
     void finishJob(const JobResult& result);
     void endJob();
     bool refuseWhileJobRuns();
+    bool lockJobFolder();
     void requestClose();
 
     std::unique_ptr<Ui::Form1> ui_;
@@ -100,6 +104,8 @@ private:
     bool closingRequested_ = false;
     bool numberRunning_ = false;
     bool jobRunning_ = false;
+    // Held from the start of a job or resume until its worker has finished.
+    FolderLock jobLock_;
 
     JobProgress jobProgress_;
     std::int64_t jobLimit_ = 0;

@@ -9,6 +9,7 @@
 #include "generation/resume_texts.hpp"
 #include "generation/startup_check.hpp"
 #include "ui/form1.hpp"
+#include "ui/form2.hpp"
 #include "ui/message_box.hpp"
 #include "ui/worker.hpp"
 #include "ui_form1.h"
@@ -37,6 +38,24 @@ bool Form1::refuseWhileJobRuns() {
     return true;
 }
 
+// Takes the folder's lock for a job or resume, or tells why the files are busy.
+bool Form1::lockJobFolder() {
+    const auto* split = qobject_cast<const Form2*>(splitWindow_.data());
+    if (split && split->splitRunning()) {
+        messages_.show(kJobWhileSplitMessage, std::string(kInfoTitle));
+        return false;
+    }
+    FolderLock lock = FolderLock::tryTake(folder_);
+    // Only another holder refuses; a folder that cannot be locked is left to the job's own
+    // file errors.
+    if (lock.busy()) {
+        messages_.show(folderBusyMessage(folder_), std::string(kInfoTitle));
+        return false;
+    }
+    jobLock_ = std::move(lock);
+    return true;
+}
+
 void Form1::Command1_Click() {
     if (refuseWhileJobRuns()) return;
     const bool enumerated = ui_->Check1->isChecked();
@@ -50,6 +69,7 @@ void Form1::Command1_Click() {
         messages_.show(*refusal, std::string(kInfoTitle));
         return;
     }
+    if (!lockJobFolder()) return;
     jobStop_.clear();
     jobRunning_ = true;
     startJobDisplay(limit, 0);
@@ -60,14 +80,13 @@ void Form1::Command1_Click() {
 }
 
 void Form1::Command3_Click() {
-    if (refuseWhileJobRuns()) return;
+    if (refuseWhileJobRuns() || !lockJobFolder()) return;
     jobStop_.clear();
     jobRunning_ = true;
     ResumeEvents events;
     events.onGathering = [this] {
-        QMetaObject::invokeMethod(this, [this] {
-            ui_->Label5->setText(QString::fromUtf8(kGatheringInfoLine.data()));
-        });
+        QMetaObject::invokeMethod(
+            this, [this] { ui_->Label5->setText(QString::fromUtf8(kGatheringInfoLine.data())); });
     };
     events.onContinuing = [this](const ResumeStart& start) {
         QMetaObject::invokeMethod(this, [this, start] {
@@ -108,8 +127,8 @@ void Form1::startJobDisplay(std::int64_t limit, std::int64_t position) {
 }
 
 void Form1::refreshJobDisplay() {
-    const std::int64_t candidate =
-        std::clamp<std::int64_t>(jobProgress_.candidate.load(), 0, std::max<std::int64_t>(jobLimit_, 1));
+    const std::int64_t candidate = std::clamp<std::int64_t>(jobProgress_.candidate.load(), 0,
+                                                            std::max<std::int64_t>(jobLimit_, 1));
     const auto position = static_cast<int>(static_cast<long double>(candidate) * kBarSteps /
                                            std::max<std::int64_t>(jobLimit_, 1));
     ui_->ProgressBar1->setValue(std::clamp(position, 0, kBarSteps));
@@ -123,6 +142,7 @@ void Form1::finishJob(const JobResult& result) {
     if (progressTimer_.isActive()) refreshJobDisplay();
     progressTimer_.stop();
     jobRunning_ = false;  // before any message: the job's files are free again
+    jobLock_.release();
     if (!closingRequested_) {
         switch (result.status) {
             case JobResult::Status::Failed:
@@ -144,6 +164,7 @@ void Form1::finishJob(const JobResult& result) {
 
 void Form1::endJob() {
     jobRunning_ = false;
+    jobLock_.release();
     Q_EMIT jobFinished();
     if (closingRequested_) close();
 }

@@ -88,6 +88,13 @@ void Form2::Command1_Click() {
         messages_.show(count.message, "Info");
         return;
     }
+    // Another window or tarn-cli may have a job on the same files.
+    FolderLock lock = FolderLock::tryTake(programFolder_);
+    if (lock.busy()) {
+        messages_.show(folderBusyMessage(programFolder_), "Info");
+        return;
+    }
+    splitLock_ = std::move(lock);
 
     splitStopRequested_ = std::make_shared<StopSignal>();
     running_ = true;
@@ -119,6 +126,7 @@ void Form2::closeEvent(QCloseEvent* event) {
 void Form2::splitEnded() {
     const SplitResult result = worker_.result();
     running_ = false;
+    splitLock_.release();
     ui_->Command2->setText(QStringLiteral("Close"));
     if (result.status == SplitStatus::Failed)
         messages_.show(result.message, "Info");

@@ -9,6 +9,7 @@
 #include <memory>
 #include <string>
 
+#include "core/folder_lock.hpp"
 #include "core/stop_signal.hpp"
 #include "tools/split_results.hpp"
 #include "ui/message_box.hpp"
@@ -63,6 +64,8 @@ private:
     QFutureWatcher<SplitResult> worker_;
     bool running_ = false;
     bool closeWhenDone_ = false;
+    // The results file's folder, held from the start of a split until its worker has finished.
+    FolderLock splitLock_;
 };
 
 }  // namespace tarn::ui

@@ -14,6 +14,7 @@
 #include <filesystem>
 #include <memory>
 
+#include "core/folder_lock.hpp"
 #include "support/temp_folder.hpp"
 #include "ui/fakes.hpp"
 #include "ui/folder_list.hpp"
@@ -104,8 +105,15 @@ TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
     split("1000");
     EXPECT_EQ(messages.last().text, ui::kSplitWhileJobMessage);
     jobRunning = false;
+    {
+        // Another window or tarn-cli has a job on the files.
+        const FolderLock other = FolderLock::tryTake(program.path());
+        split("1000");
+        EXPECT_EQ(messages.last().text, folderBusyMessage(program.path()));
+        EXPECT_EQ(text("Command2"), "Close");
+    }
     split("999.9");
-    ASSERT_EQ(messages.shown.size(), 2u);
+    ASSERT_EQ(messages.shown.size(), 3u);
     EXPECT_EQ(messages.last().text, "Minimum value is 1000 records.");
     EXPECT_EQ(messages.last().title, "Info");
     EXPECT_EQ(text("Command2"), "Close");
@@ -125,7 +133,7 @@ TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
     split("1000.9");
     EXPECT_EQ(text("Command2"), "Cancel");
     ASSERT_TRUE(finished.wait(10000));
-    ASSERT_EQ(messages.shown.size(), 3u);
+    ASSERT_EQ(messages.shown.size(), 4u);
     EXPECT_EQ(messages.last().text, "Done!!! 3 files were created.");
     EXPECT_EQ(messages.last().title, "Info");
     EXPECT_EQ(text("Command2"), "Close");

@@ -1,9 +1,15 @@
 // Generate, Resume, start-up and closing in the window, over a fresh folder.
+#include <sys/stat.h>
+
 #include <QSignalSpy>
 #include <csignal>
+#include <cstdio>
 #include <filesystem>
+#include <memory>
 
+#include "core/folder_lock.hpp"
 #include "generation/checkpoint_file.hpp"
+#include "ui/form2.hpp"
 #include "ui/termination_signals.hpp"
 #include "window_fixture.hpp"
 
@@ -149,4 +155,67 @@ TEST_F(JobCommandTest, ClosingDuringAJobStopsItQuietlyWithACheckpoint) {
     const long long last = std::stoll(file.substr(file.rfind('\n', file.size() - 2) + 1));
     EXPECT_LE(last, stopped->candidate);
     EXPECT_GT(last, stopped->candidate - 300);
+}
+
+TEST_F(JobCommandTest, GenerateAndResumeWaitWhileAnotherJobOrASplitHasTheFiles) {
+    // A stopped job that either command would change.
+    const std::string stopped = "1;2\r\n2;3\r\n3;5\r\n4;7\r\n";
+    writeFile(dir.path() + "primes.txt", stopped);
+    writeCheckpoint(dir.path() + "primes.ini", {7, 1000, 1});
+    const std::string checkpoint = readFile(dir.path() + "primes.ini");
+    const std::string busy = "Another Tarn job is working on the files in " +
+                             dir.path().substr(0, dir.path().size() - 1) +
+                             ". Wait until it ends, then try again.";
+    {
+        // Another window or tarn-cli holds the folder.
+        const FolderLock other = FolderLock::tryTake(dir.path());
+        ASSERT_TRUE(other.held());
+        c().Text1->setText("1000");
+        for (QPushButton* button : {c().Command1, c().Command3}) {
+            messages.shown.clear();
+            press(button);
+            ASSERT_EQ(messages.shown.size(), 1u) << button->text().toStdString();
+            EXPECT_EQ(messages.last().text, busy);
+            EXPECT_EQ(messages.last().title, "Info");
+        }
+        EXPECT_EQ(results(), stopped);
+        EXPECT_EQ(readFile(dir.path() + "primes.ini"), checkpoint);
+    }
+
+    // The split window reads the results file, a pipe that the test feeds, so the split surely
+    // runs until the test closes the pipe.
+    TempFolder into;
+    shell.documents = into.path();
+    ASSERT_EQ(std::remove((dir.path() + "primes.txt").c_str()), 0);
+    ASSERT_EQ(mkfifo((dir.path() + "primes.txt").c_str(), 0600), 0);
+    const auto oldPipeAction = std::signal(SIGPIPE, SIG_IGN);
+    window->spllit_Click();
+    auto* split = qobject_cast<ui::Form2*>(window->splitWindow());
+    ASSERT_NE(split, nullptr);
+    QSignalSpy splitDone(split, &ui::Form2::splitFinished);
+    split->Command1_Click();
+    std::unique_ptr<std::FILE, int (*)(std::FILE*)> pipe(
+        std::fopen((dir.path() + "primes.txt").c_str(), "w"), std::fclose);
+    ASSERT_NE(pipe, nullptr);
+    std::fputs(stopped.c_str(), pipe.get());
+    std::fflush(pipe.get());
+    ASSERT_TRUE(split->splitRunning());
+    for (QPushButton* button : {c().Command1, c().Command3}) {
+        messages.shown.clear();
+        press(button);
+        ASSERT_EQ(messages.shown.size(), 1u) << button->text().toStdString();
+        EXPECT_EQ(messages.last().text, ui::kJobWhileSplitMessage);
+        EXPECT_EQ(messages.last().title, "Info");
+    }
+    EXPECT_EQ(readFile(dir.path() + "primes.ini"), checkpoint);
+    pipe.reset();  // the split reads to the end and finishes
+    ASSERT_TRUE(splitDone.count() == 1 || splitDone.wait(10000));
+    std::signal(SIGPIPE, oldPipeAction);
+    EXPECT_EQ(messages.last().text, "Done!!! 1 files were created.");
+    EXPECT_EQ(readFile(into.path() + "primes1.txt"), stopped);
+
+    // The split has let go of the files.
+    ASSERT_EQ(std::remove((dir.path() + "primes.txt").c_str()), 0);
+    generate("100");
+    EXPECT_EQ(messages.last().text, reportFor(25, 100));
 }
