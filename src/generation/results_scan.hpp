@@ -5,6 +5,7 @@
 // It reads 1 MiB blocks and finds line ends with memchr, so it runs at the speed of the disk.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 
@@ -27,7 +28,10 @@ struct ResultsScan {
 
 // Checks that the records are numbers in one form, increasing, serially numbered from 1 when
 // enumerated, start with the seeds 2, 3, 5, 7, and end with the largest prime at or below
-// resumePoint. Looks at `stop` once per block.
-ResultsScan scanResults(const std::string& path, std::int64_t resumePoint, const StopSignal& stop);
+// resumePoint. Looks at `stop` once per block of `blockBytes` (tests make it small, to put block
+// boundaries anywhere in short files).
+inline constexpr std::size_t kResultsScanBlockBytes = std::size_t{1} << 20;
+ResultsScan scanResults(const std::string& path, std::int64_t resumePoint, const StopSignal& stop,
+                        std::size_t blockBytes = kResultsScanBlockBytes);
 
 }  // namespace tarn
