@@ -27,8 +27,9 @@ double threadCpuSeconds() {
     return static_cast<double>(t.tv_sec) + static_cast<double>(t.tv_nsec) * 1e-9;
 }
 
-// Reads the whole file in the scan's block size and does nothing with the bytes.
-std::uint64_t readAll(const std::string& path, std::size_t blockBytes) {
+// Reads the whole file in blocks of the scan's size and does nothing with the bytes.
+std::uint64_t readAll(const std::string& path,
+                      std::size_t blockBytes = tarn::kResultsScanBlockBytes) {
     const int fd = ::open(path.c_str(), O_RDONLY);
     const auto block = std::make_unique<char[]>(blockBytes);
     std::uint64_t total = 0;
@@ -56,7 +57,7 @@ struct JobFile {
         hooks.durable = false;  // the file only has to reach the page cache
         const auto result = tarn::runJob(spec, tarn::StopSignal{}, nullptr, hooks);
         if (result.status != tarn::JobResult::Status::Completed) std::abort();
-        bytes = readAll(path, std::size_t{1} << 20);
+        bytes = readAll(path);
     }
     ~JobFile() { std::filesystem::remove_all(folder); }
 };
@@ -82,7 +83,7 @@ void BM_ResumeGathering(benchmark::State& state) {
         const auto scan = tarn::scanResults(file.path, file.limit, stop);
         const auto t1 = std::chrono::steady_clock::now();
         scanCpuSeconds += threadCpuSeconds() - cpu0;
-        benchmark::DoNotOptimize(readAll(file.path, std::size_t{1} << 20));
+        benchmark::DoNotOptimize(readAll(file.path));
         const auto t2 = std::chrono::steady_clock::now();
         if (scan.outcome != tarn::ResultsScan::Outcome::Sound || scan.keptBytes != file.bytes)
             state.SkipWithError("the job's own file did not pass");

@@ -1,21 +1,25 @@
-// Reads the results file back for a resume and checks every record, at a few gigabytes a second
-// when the file is in the page cache.
+// Reads the results file back for a resume and checks every record, at several gigabytes a
+// second when the file is in the page cache (bench/resume_gathering_bench.cpp), a few times the
+// speed of parsing it line by line.
 //
 // Two checks of a line work together. The plain one (`LineCheck`) takes a line apart and applies
 // the rules in order; it decides every outcome and writes every message. The fast one
 // (`FastRun`) only accepts: a line the job itself would have written, which the plain check would
-// accept in the same way. It finds line ends 64 bytes at a time with SIMD compares and reads
-// each record without parsing it: the digits right-aligned before the CR form a key that orders
-// like the number (see results_scan_keys.hpp), so "increasing" and "at or below the candidate"
-// are comparisons of two words, the serial number is compared as text with a counter kept in the
-// same form, and the number itself is only worked out for the last record of a run. The first
-// line it does not accept goes to the plain check, which accepts it too (a number of 17 or 18
-// digits) or ends the scan with the message; the seeds 2, 3, 5, 7 always go there. So the fast
-// path can make the scan quicker but never different.
+// accept in the same way. It is fast because it does little per line and never calls out:
+// - line ends are found 64 bytes at a time, as a bit mask from SIMD compares;
+// - a record is not parsed: its digits, right-aligned in the 16 bytes before the CR, form a key
+//   that orders like the number (results_scan_keys.hpp), so "only digits", "increasing" and "at
+//   or below the candidate" are a few vector operations on one register, without a branch that
+//   depends on the data;
+// - the serial number is compared as text with a counter kept in the same form;
+// - the number itself is worked out once, for the last record of a run.
+// The first line it does not accept goes to the plain check, which accepts it too (a number of 17
+// or 18 digits) or ends the scan with the message; the seeds 2, 3, 5, 7 always go there. So the
+// fast path can make the scan quicker but never different.
 //
-// The file is read in large blocks into one buffer; the start of a line cut by a block boundary
-// is moved in front of the next block, so every line is checked in one piece. A line longer than
-// any record is damaged whatever its middle holds, so only its start and its end are kept.
+// The file is read in blocks into one buffer; the start of a line cut by a block boundary is
+// moved in front of the next block, so every line is checked in one piece. A line longer than any
+// record is damaged whatever its middle holds, so only its start and its end are kept.
 #include "generation/results_scan.hpp"
 
 #include <fcntl.h>
@@ -135,24 +139,20 @@ public:
     FastRun(const ResultsScan& scan, Key ceiling)
         : last_(scan::keyOf(scan.lastPrime)),
           ceiling_(ceiling),
-          serial_(scan.records + 1),
-          serialKey_(scan::keyOf(serial_)),
-          serialDigits_(scan::digitCount(serial_)) {}
+          serialKey_(scan::keyOf(scan.records + 1)),
+          serialDigits_(scan::digitCount(scan.records + 1)) {}
 
     // Where the first line not accepted begins (`end` when all were); [line, end) holds whole
     // lines but for the last, and the buffer has room around it.
     template <bool kEnumerated>
     const char* run(const char* line, const char* end) {
-        for (const char* chunk = line; chunk < end; chunk += 64) {
-            std::uint64_t ends = scan::lineEnds(chunk);
-            if (end - chunk < 64) ends &= (std::uint64_t{1} << (end - chunk)) - 1;
-            for (; ends != 0; ends &= ends - 1) {
-                const char* const lineEnd = chunk + std::countr_zero(ends);
-                if (!accept<kEnumerated>(line, lineEnd)) return line;
-                line = lineEnd + 1;
-            }
-        }
-        return line;
+        // As the keys increase, the last one tells whether any was above the candidate; only then
+        // is the run done again to find the first such line, which happens once in a scan.
+        const FastRun start = *this;
+        const char* const stop = stretch<kEnumerated, false>(line, end);
+        if (!(ceiling_ < last_)) return stop;
+        *this = start;
+        return stretch<kEnumerated, true>(line, end);
     }
 
     // Records accepted; the last accepted number.
@@ -160,8 +160,22 @@ public:
     std::int64_t lastPrime() const { return scan::valueOf(last_); }
 
 private:
-    // The line [line, lineEnd], lineEnd at its '\n'.
-    template <bool kEnumerated>
+    template <bool kEnumerated, bool kCeiling>
+    const char* stretch(const char* line, const char* end) {
+        for (const char* chunk = line; chunk < end; chunk += 64) {
+            std::uint64_t ends = scan::lineEnds(chunk);
+            if (end - chunk < 64) ends &= (std::uint64_t{1} << (end - chunk)) - 1;
+            for (; ends != 0; ends &= ends - 1) {
+                const char* const lineEnd = chunk + std::countr_zero(ends);
+                if (!accept<kEnumerated, kCeiling>(line, lineEnd)) return line;
+                line = lineEnd + 1;
+            }
+        }
+        return line;
+    }
+
+    // The line [line, lineEnd], lineEnd at its '\n'; with kCeiling, only at or below the candidate.
+    template <bool kEnumerated, bool kCeiling>
     bool accept(const char* line, const char* lineEnd) {
         const char* digits = line;
         if constexpr (kEnumerated) {
@@ -169,36 +183,27 @@ private:
             // the counter's they are digits, so the ';' lies before this line's end.
             const char* const semicolon = line + serialDigits_;
             if (*semicolon != ';' ||
-                !(scan::keyBefore(semicolon, scan::kKeyMasks[serialDigits_]) == serialKey_))
+                !(scan::keyBefore(semicolon, scan::keyMask(serialDigits_)) == serialKey_))
                 return false;
             digits = semicolon + 1;
         }
         const char* const cr = lineEnd - 1;
         const auto length = static_cast<std::size_t>(cr - digits);  // huge when negative
         if (length - 1 >= 16 || *cr != '\r' || *digits == '0') return false;
-        const Key mask = scan::kKeyMasks[length];
+        const Key mask = scan::keyMask(length);
         const Key key = scan::keyBefore(cr, mask);
-        if (!scan::allDigits(key, mask) || !(last_ < key) || ceiling_ < key) return false;
+        // One branch for the checks, taken only at a line the plain check has to see.
+        const bool fits =
+            scan::allDigits(key, mask) & (last_ < key) & (!kCeiling || !(ceiling_ < key));
+        if (!fits) return false;
         last_ = key;
         ++accepted_;
-        if constexpr (kEnumerated) nextSerial();
+        if constexpr (kEnumerated) scan::increment(serialKey_, serialDigits_);
         return true;
-    }
-
-    void nextSerial() {
-        ++serial_;
-        // Nine times in ten only the last digit moves.
-        if ((serialKey_.lo & 0xFF) != '9') {
-            ++serialKey_.lo;
-        } else {
-            serialKey_ = scan::keyOf(serial_);
-            serialDigits_ = scan::digitCount(serial_);
-        }
     }
 
     Key last_;
     Key ceiling_;
-    std::int64_t serial_;
     Key serialKey_;
     int serialDigits_;
     std::int64_t accepted_ = 0;
@@ -210,7 +215,7 @@ public:
         : check_(resumePoint, scan),
           scan_(scan),
           ceiling_(resumePoint < scan::kKeyLimit ? scan::keyOf(resumePoint)
-                                                 : scan::kAboveEveryKey) {}
+                                                 : scan::aboveEveryKey()) {}
 
     // Checks the whole lines of [line, end), `line` at file offset `offset`. Returns where the
     // unfinished last line begins, or nothing when the scan has ended.
