@@ -183,14 +183,16 @@ struct Damage {
 
 const Damage kDamages[] = {
     {"none", [](Draft& d, Random&) { d.touched = d.checkpointLine; }},
-    {"a digit changed",
+    {"a digit changed",  // to another, or to one of its neighbours in ASCII, '/' and ':'
      [](Draft& d, Random& r) {
          std::string& line = d.lines[anyLine(d, r)];
          std::vector<std::size_t> digits;
          for (std::size_t i = 0; i < line.size(); ++i)
              if (line[i] >= '0' && line[i] <= '9') digits.push_back(i);
          char& c = line[digits[static_cast<std::size_t>(uniform(r, 0, digits.size() - 1))]];
-         c = static_cast<char>('0' + (c - '0' + uniform(r, 1, 9)) % 10);
+         c = r() % 3   ? static_cast<char>('0' + (c - '0' + uniform(r, 1, 9)) % 10)
+             : r() % 2 ? '/'
+                       : ':';
      }},
     {"a line dropped", [](Draft& d, Random& r) { d.erase(anyLine(d, r)); }},
     {"a line repeated",
@@ -261,14 +263,16 @@ const Damage kDamages[] = {
 };
 
 // Block sizes for one file: tiny, small, the default, and sizes whose boundaries cut the damaged
-// line and the checkpoint's record (the n-th boundary of a block of b bytes lies at n * b).
+// line, the checkpoint's record and the line after it (the n-th boundary of a block of b bytes
+// lies at n * b).
 std::vector<std::size_t> blockSizes(const Draft& draft, Random& random) {
     std::vector<std::size_t> sizes{static_cast<std::size_t>(uniform(random, 1, 8)),
                                    static_cast<std::size_t>(uniform(random, 9, 120)),
                                    kResultsScanBlockBytes};
     std::vector<std::size_t> starts{0};
     for (const std::string& line : draft.lines) starts.push_back(starts.back() + line.size());
-    for (const std::size_t target : {draft.touched, draft.checkpointLine + 1}) {
+    for (const std::size_t target :
+         {draft.touched, draft.checkpointLine, draft.checkpointLine + 1}) {
         if (target >= draft.lines.size()) continue;
         const std::size_t length = draft.lines[target].size();
         for (std::size_t n = 1; n <= 3 && n < length; ++n)
