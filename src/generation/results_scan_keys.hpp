@@ -7,6 +7,7 @@
 #pragma once
 
 #include <charconv>
+#include <cstddef>
 #include <cstdint>
 #include <cstring>
 
@@ -19,7 +20,7 @@
 
 namespace tarn::scan {
 
-inline constexpr std::int64_t kKeyLimit = 10'000'000'000'000'000;  // 10^16: 17 digits
+inline constexpr std::int64_t kKeyLimit = 10'000'000'000'000'000;  // the first number of 17 digits
 
 // Sixteen zero bytes then sixteen 0xFF: the 16 bytes from kMaskBytes + n keep the last n.
 alignas(16) inline constexpr unsigned char kMaskBytes[32] = {
@@ -36,7 +37,7 @@ inline Key loadKey(const void* p) { return {_mm_loadu_si128(static_cast<const __
 inline void storeKey(Key key, char* out) {
     _mm_storeu_si128(reinterpret_cast<__m128i*>(out), key.bytes);
 }
-// The last n of the 16 bytes before `end`; those 16 bytes must be readable.
+// The 16 bytes before `end` (they must be readable), with those the mask drops set to zero.
 inline Key keyBefore(const char* end, Key mask) {
     return {_mm_and_si128(loadKey(end - 16).bytes, mask.bytes)};
 }
