@@ -1,0 +1,316 @@
+// The read-back of the results file against a reference that applies the same rules one line at a
+// time. Random files of records in either form, each damaged in the way its table row names, are
+// read in blocks of many sizes, among them blocks whose boundaries fall inside the damaged line
+// and inside the last record at or below the checkpoint. Every field of the outcome must agree,
+// the message included.
+#include "generation/results_scan.hpp"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <functional>
+#include <random>
+#include <string>
+#include <vector>
+
+#include "core/miller_rabin.hpp"
+#include "support/temp_folder.hpp"
+
+namespace tarn {
+namespace {
+
+using Outcome = ResultsScan::Outcome;
+
+// ---- The reference: each rule in the order the scan applies it.
+
+// The number the digits spell, or -1 for anything else.
+std::int64_t number(const std::string& text) {
+    if (text.empty() || text.size() > 18 || text[0] == '0') return -1;
+    for (const char c : text)
+        if (c < '0' || c > '9') return -1;
+    return std::stoll(text);
+}
+
+std::string excerpt(const std::string& record) {
+    std::string text;
+    for (const char c : record.substr(0, 40)) text += c >= ' ' && c <= '~' && c != '"' ? c : '?';
+    return record.size() > 40 ? text + "..." : text;
+}
+
+ResultsScan referenceScan(const std::string& file, std::int64_t resumePoint) {
+    ResultsScan scan;
+    scan.fileBytes = file.size();
+    const auto damaged = [&](const std::string& problem) {
+        scan.outcome = Outcome::Damaged;
+        scan.problem = problem;
+        return scan;
+    };
+    for (std::size_t start = 0, end; (end = file.find('\n', start)) != std::string::npos;
+         start = end + 1) {
+        const std::string line = std::to_string(scan.records + 1);
+        std::string record = file.substr(start, end - start);
+        if (record.empty() || record.back() != '\r')
+            return damaged("has a line that does not end with CR LF at line " + line);
+        record.pop_back();
+        const std::size_t semicolon = record.find(';');
+        const bool enumerated = semicolon != std::string::npos;
+        const std::int64_t serial = enumerated ? number(record.substr(0, semicolon)) : 0;
+        const std::int64_t value = number(enumerated ? record.substr(semicolon + 1) : record);
+        if (value < 0 || serial < 0)
+            return damaged("holds a record that is not a number at line " + line + ": \"" +
+                           excerpt(record) + "\"");
+        if (scan.records > 0 && enumerated != scan.enumerated)
+            return damaged("mixes plain and enumerated records at line " + line);
+        if (value > resumePoint) break;
+        if (enumerated && serial != scan.records + 1)
+            return damaged("has the serial number " + std::to_string(serial) + " at line " + line);
+        const std::int64_t seeds[] = {2, 3, 5, 7};
+        if (scan.records < 4 && value != seeds[scan.records])
+            return damaged("does not begin with the records 2, 3, 5 and 7 (line " + line +
+                           " holds " + std::to_string(value) + ")");
+        if (scan.records > 0 && value <= scan.lastPrime)
+            return damaged("is not in increasing order at line " + line + " (" +
+                           std::to_string(value) + " after " + std::to_string(scan.lastPrime) +
+                           ")");
+        ++scan.records;
+        scan.lastPrime = value;
+        scan.enumerated = enumerated;
+        scan.keptBytes = end + 1;
+    }
+    if (scan.records == 0)
+        return damaged("holds no records at or below " + std::to_string(resumePoint));
+    for (std::int64_t n = scan.lastPrime + 1; n <= resumePoint; ++n)
+        if (IsPrime64(static_cast<std::uint64_t>(n)))
+            return damaged("ends with " + std::to_string(scan.lastPrime) + ", but the prime " +
+                           std::to_string(n) + " is missing before the checkpoint's candidate " +
+                           std::to_string(resumePoint));
+    scan.outcome = Outcome::Sound;
+    return scan;
+}
+
+std::string describe(const ResultsScan& scan) {
+    return std::to_string(static_cast<int>(scan.outcome)) + " \"" + scan.problem + "\" records " +
+           std::to_string(scan.records) + " last " + std::to_string(scan.lastPrime) +
+           " enumerated " + std::to_string(scan.enumerated) + " kept " +
+           std::to_string(scan.keptBytes) + " of " + std::to_string(scan.fileBytes);
+}
+
+// ---- Random files: the seeds, random increasing numbers of any length up to 18 digits, the
+// largest prime at or below the checkpoint's candidate, sometimes records beyond it.
+
+using Random = std::mt19937_64;
+
+std::int64_t uniform(Random& random, std::int64_t low, std::int64_t high) {
+    return std::uniform_int_distribution<std::int64_t>(low, high)(random);
+}
+
+std::int64_t power10(int digits) {
+    std::int64_t p = 1;
+    while (digits-- > 0) p *= 10;
+    return p;
+}
+
+struct Draft {
+    bool enumerated = false;
+    std::int64_t resumePoint = 0;
+    std::vector<std::string> lines;  // each with its line end, but for a torn last one
+    std::size_t checkpointLine = 0;  // the last record at or below resumePoint
+    std::size_t touched = 0;         // the line the damage went to
+
+    std::string record(std::int64_t serial, std::int64_t value) const {
+        return (enumerated ? std::to_string(serial) + ";" : "") + std::to_string(value) + "\r\n";
+    }
+    void insert(std::size_t at, const std::string& line) {
+        lines.insert(lines.begin() + static_cast<std::ptrdiff_t>(at), line);
+        if (at <= checkpointLine) ++checkpointLine;
+    }
+    void erase(std::size_t at) {
+        lines.erase(lines.begin() + static_cast<std::ptrdiff_t>(at));
+        if (at <= checkpointLine && checkpointLine > 0) --checkpointLine;
+    }
+    std::string text() const {
+        std::string all;
+        for (const std::string& line : lines) all += line;
+        return all;
+    }
+    // Appends records above the candidate: increasing, well formed, numbered on.
+    void appendBeyond(Random& random, int count) {
+        std::int64_t value = resumePoint;
+        for (int i = 0; i < count && value < power10(17); ++i) {
+            value += uniform(random, 1, random() % 2 ? 30 : value);
+            lines.push_back(record(static_cast<std::int64_t>(lines.size()) + 1, value));
+        }
+    }
+};
+
+Draft randomDraft(Random& random) {
+    Draft draft;
+    draft.enumerated = random() % 2;
+    const int digits = static_cast<int>(uniform(random, 2, 18));
+    draft.resumePoint = uniform(random, power10(digits - 1), power10(digits) - 1);
+    std::int64_t last = draft.resumePoint;
+    while (!IsPrime64(static_cast<std::uint64_t>(last))) --last;
+    std::vector<std::int64_t> values;
+    for (int i = static_cast<int>(uniform(random, 0, 40)); i > 0; --i) {
+        const int length = static_cast<int>(uniform(random, 1, digits));
+        const std::int64_t value = uniform(random, power10(length - 1), power10(length) - 1);
+        if (value > 7 && value < last) values.push_back(value);
+    }
+    std::sort(values.begin(), values.end());
+    values.erase(std::unique(values.begin(), values.end()), values.end());
+    values.insert(values.begin(), {2, 3, 5, 7});
+    if (last > 7) values.push_back(last);
+    for (std::size_t i = 0; i < values.size(); ++i)
+        draft.lines.push_back(draft.record(static_cast<std::int64_t>(i) + 1, values[i]));
+    draft.checkpointLine = draft.lines.size() - 1;
+    if (random() % 3 == 0) draft.appendBeyond(random, static_cast<int>(uniform(random, 1, 4)));
+    return draft;
+}
+
+std::size_t anyLine(Draft& draft, Random& random) {
+    draft.touched = static_cast<std::size_t>(uniform(random, 0, draft.lines.size() - 1));
+    return draft.touched;
+}
+
+// Bytes a stray byte is drawn from: the digits' neighbours in ASCII, separators, control bytes.
+const std::string kStray = std::string("/:0;9\r\n x-+\x7f\xff") + '\0';
+
+struct Damage {
+    const char* name;
+    std::function<void(Draft&, Random&)> apply;
+};
+
+const Damage kDamages[] = {
+    {"none", [](Draft& d, Random&) { d.touched = d.checkpointLine; }},
+    {"a digit changed",  // to another, or to one of its neighbours in ASCII, '/' and ':'
+     [](Draft& d, Random& r) {
+         std::string& line = d.lines[anyLine(d, r)];
+         std::vector<std::size_t> digits;
+         for (std::size_t i = 0; i < line.size(); ++i)
+             if (line[i] >= '0' && line[i] <= '9') digits.push_back(i);
+         char& c = line[digits[static_cast<std::size_t>(uniform(r, 0, digits.size() - 1))]];
+         c = r() % 3   ? static_cast<char>('0' + (c - '0' + uniform(r, 1, 9)) % 10)
+             : r() % 2 ? '/'
+                       : ':';
+     }},
+    {"a line dropped", [](Draft& d, Random& r) { d.erase(anyLine(d, r)); }},
+    {"a line repeated",
+     [](Draft& d, Random& r) {
+         const std::size_t at = anyLine(d, r);
+         d.insert(at, d.lines[at]);
+     }},
+    {"lines swapped",
+     [](Draft& d, Random& r) {
+         const std::size_t at = anyLine(d, r);
+         if (at + 1 < d.lines.size()) std::swap(d.lines[at], d.lines[at + 1]);
+     }},
+    {"a serial number off by one",  // in a plain file, a serial number where none belongs
+     [](Draft& d, Random& r) {
+         std::string& line = d.lines[anyLine(d, r)];
+         const std::size_t semicolon = line.find(';');
+         if (semicolon == std::string::npos) {
+             line = std::to_string(d.touched + 1) + ";" + line;
+             return;
+         }
+         const std::int64_t serial = std::stoll(line.substr(0, semicolon)) + (r() % 2 ? 1 : -1);
+         line = std::to_string(serial) + line.substr(semicolon);
+     }},
+    {"a leading zero",
+     [](Draft& d, Random& r) {
+         std::string& line = d.lines[anyLine(d, r)];
+         const std::size_t semicolon = line.find(';');
+         const std::size_t at = semicolon != std::string::npos && r() % 2 ? semicolon + 1 : 0;
+         line = line.substr(0, at) + '0' + line.substr(at);
+     }},
+    {"a stray byte",
+     [](Draft& d, Random& r) {
+         std::string& line = d.lines[anyLine(d, r)];
+         line.insert(line.begin() + uniform(r, 0, static_cast<std::int64_t>(line.size())),
+                     kStray[static_cast<std::size_t>(uniform(r, 0, kStray.size() - 1))]);
+     }},
+    {"a byte lost",
+     [](Draft& d, Random& r) {
+         std::string& line = d.lines[anyLine(d, r)];
+         line.erase(static_cast<std::size_t>(uniform(r, 0, line.size() - 1)), 1);
+     }},
+    {"a CR missing",
+     [](Draft& d, Random& r) {
+         std::string& line = d.lines[anyLine(d, r)];
+         line.erase(line.size() - 2, 1);
+     }},
+    {"an empty line", [](Draft& d, Random& r) { d.insert(anyLine(d, r), "\r\n"); }},
+    {"a long line",  // longer than any record, mostly digits, mostly ending in CR LF
+     [](Draft& d, Random& r) {
+         std::string line;
+         for (std::int64_t n = uniform(r, 19, 300); n > 0; --n)
+             line += r() % 8 ? static_cast<char>('0' + r() % 10) : ';';
+         d.insert(anyLine(d, r), line + (r() % 4 ? "\r\n" : "\n"));
+     }},
+    {"a torn last line",
+     [](Draft& d, Random& r) {
+         const std::size_t at = anyLine(d, r);
+         d.lines.resize(at + 1);
+         d.lines[at].resize(static_cast<std::size_t>(uniform(r, 0, d.lines[at].size() - 1)));
+     }},
+    {"records past the checkpoint, then garbage",
+     [](Draft& d, Random& r) {
+         d.lines.resize(d.checkpointLine + 1);
+         d.appendBeyond(r, static_cast<int>(uniform(r, 1, 3)));
+         d.touched = d.checkpointLine + 1;
+         d.lines.push_back(r() % 2 ? "garbage\r\n" : "0;0");
+     }},
+};
+
+// Block sizes for one file: tiny, small, the default, and sizes whose boundaries cut the damaged
+// line, the checkpoint's record and the line after it (the n-th boundary of a block of b bytes
+// lies at n * b).
+std::vector<std::size_t> blockSizes(const Draft& draft, Random& random) {
+    std::vector<std::size_t> sizes{static_cast<std::size_t>(uniform(random, 1, 8)),
+                                   static_cast<std::size_t>(uniform(random, 9, 120)),
+                                   kResultsScanBlockBytes};
+    std::vector<std::size_t> starts{0};
+    for (const std::string& line : draft.lines) starts.push_back(starts.back() + line.size());
+    for (const std::size_t target :
+         {draft.touched, draft.checkpointLine, draft.checkpointLine + 1}) {
+        if (target >= draft.lines.size()) continue;
+        const std::size_t length = draft.lines[target].size();
+        for (std::size_t n = 1; n <= 3 && n < length; ++n)
+            sizes.push_back((starts[target] + static_cast<std::size_t>(
+                                                  uniform(random, static_cast<std::int64_t>(n),
+                                                          static_cast<std::int64_t>(length) - 1))) /
+                            n);
+    }
+    sizes.erase(std::remove(sizes.begin(), sizes.end(), 0), sizes.end());
+    return sizes;
+}
+
+TEST(ResultsScan, AgreesWithALineByLineReadingOfRandomDamagedFiles) {
+    const test::TempFolder folder;
+    const std::string path = folder.path() + "primes.txt";
+    Random random(20240611);
+    for (const Damage& damage : kDamages) {
+        int failures = 0;
+        for (int n = 0; n < 150 && failures < 3; ++n) {
+            Draft draft = randomDraft(random);
+            damage.apply(draft, random);
+            const std::string text = draft.text();
+            std::filesystem::remove(path);  // ext4 flushes a file cut to 0 and written again
+            test::writeFile(path, text);
+            const std::string expected = describe(referenceScan(text, draft.resumePoint));
+            for (const std::size_t blockBytes : blockSizes(draft, random)) {
+                const std::string got =
+                    describe(scanResults(path, draft.resumePoint, StopSignal{}, blockBytes));
+                if (got == expected) continue;
+                ADD_FAILURE() << damage.name << ", blocks of " << blockBytes << ", candidate "
+                              << draft.resumePoint << ", file:\n"
+                              << text << "\ngot      " << got << "\nexpected " << expected;
+                ++failures;
+                break;
+            }
+        }
+    }
+}
+
+}  // namespace
+}  // namespace tarn
