@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Times `tarn-cli generate` against `primesieve -p` writing the same primes to the same disk,
-# alternating the two (best of 3 each), and prints the wall-time ratio ours/theirs, both output
-# rates, our peak memory, and the cost of the periodic flush and checkpoint (a run without them).
+# alternating the two (best of 3 each): a table of our time, output rate and ratio ours/theirs
+# with 1, 2 and all sieving threads, our peak memory, and a run without the periodic flush and
+# checkpoint.
 # Usage: bench/generate_vs_primesieve.sh [build-dir] [limit]   (TARN_BENCH_BIG=1 also times 10^10)
 set -euo pipefail
 
@@ -32,10 +33,17 @@ ours() { timed "$cli" --folder "$work" generate "$limit" "$@"; }
 theirs() { timed sh -c "primesieve $limit -p > '$work/primesieve.txt'"; }
 best() { printf '%s\n' "$@" | sort -g | head -1; }
 
-o=() t=() n=()
+cores=$(nproc)
+threadCounts=(1 2 "$cores")
+[ "$cores" -le 2 ] && threadCounts=(1 2)
+declare -A times
+t=() n=()
 ourPeak=0
 for _ in 1 2 3; do
-    ours; o+=("$wall"); [ "$peak" -gt "$ourPeak" ] && ourPeak=$peak
+    for k in "${threadCounts[@]}"; do
+        ours --threads "$k"; times[$k]+="$wall "
+        [ "$peak" -gt "$ourPeak" ] && ourPeak=$peak
+    done
     theirs; t+=("$wall")
     ours --no-sync; n+=("$wall")
 done
@@ -45,16 +53,18 @@ if ! tr -d '\r' < "$work/primes.txt" | cmp -s - "$work/primesieve.txt"; then
     echo "MISMATCH: the two files name different primes" >&2
     exit 1
 fi
-bo=$(best "${o[@]}") bt=$(best "${t[@]}") bn=$(best "${n[@]}")
-awk -v bo="$bo" -v bt="$bt" -v bn="$bn" -v ob="$ourBytes" -v tb="$theirBytes" -v pk="$ourPeak" \
-    -v lim="$limit" 'BEGIN {
-    printf "limit %s: tarn-cli %.2f s (%.0f MB/s), primesieve -p %.2f s (%.0f MB/s)\n",
-        lim, bo, ob / bo / 1e6, bt, tb / bt / 1e6
-    printf "ratio ours/theirs: %.2f\n", bo / bt
-    printf "tarn-cli peak memory: %.1f MiB\n", pk / 1024
-    printf "flush and checkpoint cost: %.2f s with, %.2f s without (%+.0f%%)\n",
-        bo, bn, 100 * (bo - bn) / bn
-}'
+bt=$(best "${t[@]}") bn=$(best "${n[@]}")
+printf 'limit %s, %s cores; primesieve -p: %.2f s (%.0f MB/s)\n' "$limit" "$cores" "$bt" \
+    "$(awk -v b="$theirBytes" -v s="$bt" 'BEGIN { print b / s / 1e6 }')"
+printf '%-9s %8s %8s %12s\n' threads seconds MB/s ours/theirs
+for k in "${threadCounts[@]}"; do
+    # shellcheck disable=SC2086
+    bo=$(best ${times[$k]})
+    awk -v k="$k" -v bo="$bo" -v bt="$bt" -v ob="$ourBytes" \
+        'BEGIN { printf "%-9s %8.2f %8.0f %12.2f\n", k, bo, ob / bo / 1e6, bo / bt }'
+done
+printf 'tarn-cli peak memory: %.1f MiB\n' "$(awk -v p="$ourPeak" 'BEGIN { print p / 1024 }')"
+printf 'all threads without the periodic flush and checkpoint: %.2f s\n' "$bn"
 
 if [ "${TARN_BENCH_BIG:-0}" = 1 ]; then
     rm -f "$work/primes.txt" "$work/primesieve.txt"

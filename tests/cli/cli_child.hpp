@@ -55,7 +55,9 @@ public:
     // inside its work however slowly the program starts (sanitizer builds on a busy machine).
     void waitForOutput() const {
         const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(20);
-        while (std::filesystem::file_size(outPath_) == 0 && std::chrono::steady_clock::now() < until)
+        std::error_code error;
+        while ((std::filesystem::file_size(outPath_, error) == 0 || error) &&
+               std::chrono::steady_clock::now() < until)
             std::this_thread::sleep_for(std::chrono::milliseconds(2));
     }
 

@@ -79,10 +79,19 @@ TEST(JobCommands, TerminationStopsTheJobWithExitCodeThree) {
         const Cli cli;
         if (resume) writeFile(cli.results(), oracleResults(37, false));
         if (resume) writeFile(cli.folder.path() + "primes.ini", " 37  100000000000  1 \r\n");
+        const auto before = resume ? std::filesystem::file_size(cli.results()) : 0;
         CliChild child(cli.args(resume ? std::vector<std::string>{"resume"}
                                        : std::vector<std::string>{"generate", "100000000000"}),
                        cli.output.path());
-        std::this_thread::sleep_for(std::chrono::milliseconds(300));
+        // The signal comes once the job is writing records, however slowly the program starts.
+        const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+        const auto size = [&] {
+            std::error_code error;  // not there yet: nothing written
+            const auto bytes = std::filesystem::file_size(cli.results(), error);
+            return error ? 0 : bytes;
+        };
+        while (size() <= before + 100'000 && std::chrono::steady_clock::now() < until)
+            std::this_thread::sleep_for(std::chrono::milliseconds(2));
         child.signal(SIGTERM);
         EXPECT_EQ(child.wait(), 3) << child.err();
         EXPECT_EQ(child.err(), (resume ? kResumeNotes : "") + "All calculations were stopped!\n");
