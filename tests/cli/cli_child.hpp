@@ -7,10 +7,10 @@
 #include <spawn.h>
 #include <sys/wait.h>
 
-#include <ostream>
-#include <string>
 #include <chrono>
 #include <filesystem>
+#include <ostream>
+#include <string>
 #include <thread>
 #include <vector>
 

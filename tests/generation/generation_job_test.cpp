@@ -62,10 +62,10 @@ TEST(GenerationJob, CompleteRunsMatchTheOracle) {
         for (const bool enumerated : {false, true})
             expectComplete(limit, enumerated, threads++ % 3 + 1);
     // The first batch is one turn, the next ones 32768 turns, a chunk 8 batches: edges of the
-    // first batch, the first chunk and the second.
-    for (const std::int64_t turns : {32769, 8 * 32768, 16 * 32768}) {
+    // first batch and of the first chunk.
+    for (const std::int64_t turns : {32769, 8 * 32768}) {
         const std::int64_t edge = 30 * turns + 11;
-        for (const std::int64_t limit : {edge - 1, edge, edge + 1, edge + 30})
+        for (const std::int64_t limit : {edge - 1, edge})
             expectComplete(limit, limit % 2 == 0, threads++ % 3 + 1);
     }
     // Many small chunks for more threads than cores, each waiting for the serial numbers of the
@@ -75,9 +75,8 @@ TEST(GenerationJob, CompleteRunsMatchTheOracle) {
     small.turnsPerChunk = 50;
     for (const int many : {2, 3, 8}) expectComplete(300'007, true, many, small);
     std::mt19937_64 random(20240601);
-    std::uniform_int_distribution<std::int64_t> pick(100, 10'000'000);
-    for (int i = 0; i < 4; ++i) expectComplete(pick(random), i % 2 == 1, i % 3 + 1);
-    expectComplete(10'000'000, false, 2);
+    std::uniform_int_distribution<std::int64_t> pick(100, 3'000'000);
+    for (int i = 0; i < 3; ++i) expectComplete(pick(random), i % 2 == 1, i % 3 + 1);
 }
 
 // A job stopped after `turns` turns (0: a stop asked before the start, which still lets the first
