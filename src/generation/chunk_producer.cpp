@@ -32,8 +32,9 @@ ChunkProducer::~ChunkProducer() {
     join();
 }
 
-void ChunkProducer::start(int threads) {
-    for (int i = 0; i < std::max(threads, 1); ++i) threads_.emplace_back([this] { work(); });
+void ChunkProducer::start(int threads, WheelSieve&& first) {
+    threads_.emplace_back([this, sieve = std::move(first)]() mutable { work(std::move(sieve)); });
+    for (int i = 1; i < threads; ++i) threads_.emplace_back([this] { work(std::nullopt); });
 }
 
 void ChunkProducer::join() {
@@ -50,10 +51,9 @@ void ChunkProducer::close(bool failed) {
     published_.notify_all();
 }
 
-void ChunkProducer::work() {
+void ChunkProducer::work(std::optional<WheelSieve> sieve) {
     RecordBuffer* buffer = nullptr;
     try {
-        std::optional<WheelSieve> sieve;
         std::vector<std::uint8_t> sieved(static_cast<std::size_t>(plan_.chunkTurns));
         for (;;) {
             // A buffer first, then a chunk: a claimed chunk never waits for memory.

@@ -15,6 +15,7 @@
 #include <cstdint>
 #include <map>
 #include <mutex>
+#include <optional>
 #include <thread>
 #include <vector>
 
@@ -44,8 +45,9 @@ public:
     ChunkProducer(const ChunkProducer&) = delete;
     ChunkProducer& operator=(const ChunkProducer&) = delete;
 
-    // Starts `threads` sieving threads (at least one) and returns at once.
-    void start(int threads);
+    // Starts `threads` sieving threads (at least one) and returns at once; the first thread
+    // takes `first`, a sieve that starts at the plan's first turn.
+    void start(int threads, WheelSieve&& first);
     // Waits until every thread has left.
     void join();
 
@@ -56,7 +58,7 @@ private:
         std::int64_t endTurn = 0;
     };
 
-    void work();
+    void work(std::optional<WheelSieve> sieve);
     Claim claim();
     // Sieves the chunk into `sieved` and returns the turn it ended before (early on a stop).
     std::int64_t sieveChunk(WheelSieve& sieve, const Claim& chunk,

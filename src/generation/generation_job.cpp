@@ -1,9 +1,8 @@
-// The generation job: the calling thread sieves a segment of wheel turns and formats its primes
-// into large buffers, handing full buffers over at turn boundaries to the write pipeline (a
-// writer and a checkpointer thread), so that the two cores and the disk work at once.
-// The stop request is looked at after every segment (well under a millisecond of work), and a
-// stop leaves the job at the end of a whole turn; the first segment is a single turn, so a stop
-// asked before the job began ends it after the turn 11 to 37.
+// The generation job wires the sieving threads (chunk_producer) to the write pipeline (a writer
+// and a checkpointer thread) over the results file, so that every core and the disk work at
+// once. The stop request is looked at after every segment (well under a millisecond of work),
+// and a stop leaves the job at the end of a whole turn; the first segment is a single turn, so a
+// stop asked before the job began ends it after the turn 11 to 37.
 // Whatever fails, the job ends with every record that is surely in the file kept, anything that
 // may be torn cut off, and a checkpoint that describes the file, so that a resume continues it.
 #include "generation/generation_job.hpp"
@@ -27,7 +26,7 @@ namespace tarn {
 namespace {
 
 constexpr std::int64_t kSegmentTurns = 32 * 1024;  // 32 KiB of sieve: the first-level cache
-constexpr std::int64_t kSegmentsPerChunk = 8;      // a few MiB of records per write
+constexpr std::int64_t kSegmentsPerChunk = 4;      // 2 to 5 MiB of records per write
 // Memory for the sieving threads' own state and their buffers, whatever the core count.
 constexpr std::uint64_t kThreadBudget = 48u << 20;
 constexpr std::uint64_t kChunkRecordBytes = 40;  // per turn at most, in practice
@@ -105,6 +104,8 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
     const std::int64_t first = turnIndex(firstTurnStart);
     const std::int64_t end = std::max(first, spec.limit >= 11 ? turnIndex(spec.limit) + 1 : 0);
 
+    // The first thread's sieve is built before any file is touched: at the top of the range it
+    // is the job's largest piece of memory.
     std::optional<WheelSieve> sieve;
     try {
         sieve.emplace(first, spec.limit);
@@ -163,7 +164,7 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
                 pipeline.hand(seeds);
             }
             ChunkProducer producer(plan, pipeline, stop, hooks, progress);
-            producer.start(threads);
+            producer.start(threads, std::move(*sieve));
             producer.join();
         } catch (...) {
             // What was handed over is written or not; the rest is dropped.

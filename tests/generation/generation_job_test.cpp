@@ -61,9 +61,9 @@ TEST(GenerationJob, CompleteRunsMatchTheOracle) {
          {100, 110, 997, 1000, 1206, 1207, 1208, 1210, 1211, 1212, 30 * 331 + 7, 30 * 331 + 11})
         for (const bool enumerated : {false, true})
             expectComplete(limit, enumerated, threads++ % 3 + 1);
-    // The first batch is one turn, the next ones 32768 turns, a chunk 8 batches: edges of the
+    // The first batch is one turn, the next ones 32768 turns, a chunk 4 batches: edges of the
     // first batch and of the first chunk.
-    for (const std::int64_t turns : {32769, 8 * 32768}) {
+    for (const std::int64_t turns : {32769, 4 * 32768}) {
         const std::int64_t edge = 30 * turns + 11;
         for (const std::int64_t limit : {edge - 1, edge})
             expectComplete(limit, limit % 2 == 0, threads++ % 3 + 1);
