@@ -10,6 +10,7 @@
 #include "core/entry.hpp"
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
+#include "core/wheel.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/file_names.hpp"
 #include "generation/results_scan.hpp"
@@ -76,7 +77,7 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     const std::int64_t limit = checkpoint->limit;
     if (resumePoint > limit) return refused(std::string(kImpossibleToResumeMessage));
     // Stopped jobs leave the last candidate of a complete turn, 30k + 7 with k >= 0.
-    if (resumePoint < 7 || resumePoint % 30 != 7)
+    if (resumePoint < kTurnEndResidue || resumePoint % kWheelPeriod != kTurnEndResidue)
         return refused(misalignedCheckpointRefusal(checkpointPath, resumePoint));
     if (limit > kUpperEntryWhole) return refused(limitOutOfRangeRefusal(checkpointPath, limit));
 
@@ -116,7 +117,7 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     spec.limit = limit;
     spec.enumerated = scan.enumerated;
     spec.append = true;
-    spec.firstTurn = resumePoint + 4;
+    spec.firstTurn = resumePoint + kLastToNextTurn;
     spec.primeCountBefore = scan.records;
     spec.threads = threads;
 
