@@ -26,6 +26,17 @@ ResumeResult refused(std::string message) {
     return result;
 }
 
+// A failure of the resume itself, before the job ran; `message` is the whole "Info" text.
+ResumeResult failed(std::string message, const std::string& resultsPath) {
+    ResumeResult result;
+    result.status = ResumeResult::Status::Failed;
+    result.message = std::move(message);
+    result.job.status = JobResult::Status::Failed;
+    result.job.error = result.message;
+    result.job.resultsPath = resultsPath;
+    return result;
+}
+
 // The files are as they were; the checkpoint still says where the job stands.
 ResumeResult stoppedWhileGathering(const std::string& resultsPath, std::int64_t resumePoint,
                                    std::int64_t limit) {
@@ -49,13 +60,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
         return resume(folder, stop, progress, events, hooks, threads);
     } catch (...) {
         // Reading and checking change no file, and the job guards its own writes.
-        ResumeResult result;
-        result.status = ResumeResult::Status::Failed;
-        result.message = unexpectedFailure(describeCurrentException());
-        result.job.status = JobResult::Status::Failed;
-        result.job.error = result.message;
-        result.job.resultsPath = folder + kResultsFileName;
-        return result;
+        return failed(unexpectedFailure(describeCurrentException()), folder + kResultsFileName);
     }
 }
 
@@ -99,15 +104,8 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     // Records past the checkpoint and a torn last line were written after the last checkpoint
     // of a killed job; the turns that wrote them run again.
     if (scan.keptBytes < scan.fileBytes &&
-        ::truncate(resultsPath.c_str(), static_cast<off_t>(scan.keptBytes)) != 0) {
-        ResumeResult result;
-        result.status = ResumeResult::Status::Failed;
-        result.message = truncationFailure(resultsPath, systemReason(errno));
-        result.job.status = JobResult::Status::Failed;
-        result.job.error = result.message;
-        result.job.resultsPath = resultsPath;
-        return result;
-    }
+        ::truncate(resultsPath.c_str(), static_cast<off_t>(scan.keptBytes)) != 0)
+        return failed(truncationFailure(resultsPath, systemReason(errno)), resultsPath);
 
     const ResumeStart start{limit, resumePoint, scan.records, scan.enumerated};
     if (events.onContinuing) events.onContinuing(start);
