@@ -12,7 +12,7 @@ namespace {
 // Small primes tried by division first: they settle most composites at once, and every odd
 // number left below the square of the next prime (41) is prime without a modular power.
 constexpr std::uint64_t kSmallPrimes[] = {2, 3, 5, 7, 11, 13, 17, 19, 23, 29, 31, 37};
-constexpr std::uint64_t kPrimeBelow = 41 * 41;
+constexpr std::uint64_t kSurelyPrimeBelow = 41 * 41;
 
 // Strong probable-prime tests to these bases leave no pseudoprime below 2^64 (Jim Sinclair).
 constexpr std::uint64_t kBases[] = {2, 325, 9375, 28178, 450775, 9780504, 1795265022};
@@ -50,7 +50,7 @@ bool isPrime(std::uint64_t n) {
     for (std::uint64_t p : kSmallPrimes) {
         if (n % p == 0) return n == p;
     }
-    if (n < kPrimeBelow) return true;
+    if (n < kSurelyPrimeBelow) return true;
     return passesStrongTests(n);
 }
 
