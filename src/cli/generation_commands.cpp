@@ -39,7 +39,7 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
             ctx.exitCode = kRefused;
             return;
         }
-        if (const auto refusal = checkGenerationMinimum(*entry.number)) {
+        if (const auto refusal = checkGenerationMinimum(entry.number->whole())) {
             std::cerr << *refusal << '\n';
             ctx.exitCode = kRefused;
             return;

@@ -6,9 +6,8 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/entry_batch.hpp"
-#include "core/command_texts.hpp"
 #include "core/factorization.hpp"
-#include "core/trial_division.hpp"
+#include "core/miller_rabin.hpp"
 #include "core/verdicts.hpp"
 
 namespace tarn::cli {
@@ -19,13 +18,11 @@ void registerNumberCommands(CLI::App& app, Context& ctx) {
         "test", "Tell whether each number is prime (numbers from standard input when none given)");
     test->add_option("numbers", *testNumbers, "Whole numbers from 2 to 922337203685277");
     test->callback([&ctx, testNumbers] {
-        // CheckPrime gives the trial division's verdict at a small fraction of its cost, and
-        // leaves the stop request alone so that Ctrl-C ends the whole batch.
+        // isPrime gives the Test command's verdict for every entry (2 included, which the
+        // window answers before its trial division) at a small fraction of the trial
+        // division's cost, and leaves the stop request alone so that Ctrl-C ends the batch.
         ctx.exitCode = runEntryBatch(ctx, *testNumbers, [](std::int64_t n, std::string& out) {
-            if (n == 2)
-                out += kTwoIsPrimeMessage;
-            else
-                out += testVerdictMessage(n, CheckPrime(n));
+            out += testVerdictMessage(n, isPrime(static_cast<std::uint64_t>(n)));
             out += '\n';
             return true;
         });

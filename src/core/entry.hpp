@@ -11,9 +11,11 @@
 
 namespace tarn {
 
-inline constexpr double kLowerEntryBound = 2.0;
-inline constexpr double kUpperEntryBound = 922337203685277.0;
+// The range of the entry, both ends included: 200 below the Number type's largest whole value,
+// and the figure the range message quotes.
 inline constexpr std::int64_t kUpperEntryWhole = 922337203685277;
+inline constexpr double kLowerEntryBound = 2.0;
+inline constexpr double kUpperEntryBound = static_cast<double>(kUpperEntryWhole);
 
 inline constexpr std::string_view kInvalidEntryMessage = "Invalid entry.";
 inline constexpr std::string_view kOutOfRangeMessage =

@@ -1,3 +1,6 @@
+// Factorization in three steps: the primes below 2048 by multiply-and-compare division, then
+// square and cube roots, then Pollard-Brent rho on what is left, every piece checked by isPrime.
+// Fixed arrays hold the factors, so a factorization allocates only its result.
 #include "core/factorization.hpp"
 
 #include <algorithm>
@@ -13,7 +16,10 @@
 namespace tarn {
 namespace {
 
-// Prime factors with repetition; a number below 2^63 has fewer than 63.
+// A number below 2^63 has fewer than 63 prime factors, counted with repetition.
+constexpr std::size_t kMaxPrimeFactors = 64;
+
+// Prime factors with repetition.
 class PrimeCollector {
 public:
     void add(std::uint64_t p, unsigned times = 1) {
@@ -32,22 +38,28 @@ public:
     }
 
 private:
-    std::array<std::uint64_t, 64> primes_{};
+    std::array<std::uint64_t, kMaxPrimeFactors> primes_{};
     std::size_t count_ = 0;
 };
 
-std::uint64_t exactSquareRoot(std::uint64_t m) {
-    const auto s = static_cast<std::uint64_t>(std::llround(std::sqrt(static_cast<double>(m))));
+// r when m is r^k (k is 2 or 3), otherwise 0. The double root is off by at most one.
+std::uint64_t exactRoot(std::uint64_t m, unsigned k) {
+    const double root =
+        k == 2 ? std::sqrt(static_cast<double>(m)) : std::cbrt(static_cast<double>(m));
+    const auto s = static_cast<std::uint64_t>(std::llround(root));
     for (std::uint64_t r = s > 0 ? s - 1 : 0; r <= s + 1; ++r) {
-        if (r * r == m) return r;
+        std::uint64_t power = r;
+        for (unsigned i = 1; i < k; ++i) power *= r;
+        if (power == m) return r;
     }
     return 0;
 }
 
-std::uint64_t exactCubeRoot(std::uint64_t m) {
-    const auto s = static_cast<std::uint64_t>(std::llround(std::cbrt(static_cast<double>(m))));
-    for (std::uint64_t r = s > 0 ? s - 1 : 0; r <= s + 1; ++r) {
-        if (r * r * r == m) return r;
+// 2 or 3 with `root` set when m is root^2 or root^3 (squares first), otherwise 0.
+unsigned squareOrCube(std::uint64_t m, std::uint64_t& root) {
+    for (const unsigned k : {2u, 3u}) {
+        root = exactRoot(m, k);
+        if (root != 0) return k;
     }
     return 0;
 }
@@ -60,24 +72,19 @@ constexpr std::uint64_t kSurelyPrimeBelow = kLastTrialPrime * kLastTrialPrime;
 // Splits an odd m, all of whose prime factors are above the trial primes, into primes.
 // Returns false when stopped.
 bool splitLarge(std::uint64_t m, PrimeCollector& out, const StopSignal& stop) {
-    std::array<std::uint64_t, 64> pending{};
+    std::array<std::uint64_t, kMaxPrimeFactors> pending{};
     std::size_t count = 0;
     pending[count++] = m;
     while (count > 0) {
         const std::uint64_t v = pending[--count];
-        if (v < kSurelyPrimeBelow || IsPrimeOdd(Montgomery(v))) {
+        if (v < kSurelyPrimeBelow || isPrime(v)) {
             out.add(v);
             continue;
         }
-        if (const std::uint64_t r = exactSquareRoot(v); r != 0) {
-            pending[count++] = r;
-            pending[count++] = r;
-            continue;
-        }
-        if (const std::uint64_t r = exactCubeRoot(v); r != 0) {
-            pending[count++] = r;
-            pending[count++] = r;
-            pending[count++] = r;
+        // A square or a cube falls to its root at once, well before a rho walk would part it.
+        std::uint64_t root = 0;
+        if (const unsigned k = squareOrCube(v, root); k != 0) {
+            for (unsigned i = 0; i < k; ++i) pending[count++] = root;
             continue;
         }
         const std::uint64_t f = PollardBrentFactor(v, stop);

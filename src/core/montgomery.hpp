@@ -9,14 +9,18 @@ namespace tarn {
 
 using u128 = unsigned __int128;
 
+// n^-1 mod 2^64 for odd n. Newton's iteration doubles the correct low bits on every step:
+// n is its own inverse to 3 bits, so five steps give 96 >= 64.
+constexpr std::uint64_t inverseMod2_64(std::uint64_t n) {
+    std::uint64_t inverse = n;
+    for (int i = 0; i < 5; ++i) inverse *= 2 - n * inverse;
+    return inverse;
+}
+
 class Montgomery {
 public:
     // n must be odd and above 1.
-    explicit Montgomery(std::uint64_t n) : n_(n) {
-        // Newton's iteration doubles the correct low bits of n^-1 mod 2^64: 3 -> 96.
-        std::uint64_t inv = n;
-        for (int i = 0; i < 5; ++i) inv *= 2 - n * inv;
-        inv_ = inv;
+    explicit Montgomery(std::uint64_t n) : n_(n), inv_(inverseMod2_64(n)) {
         const std::uint64_t r1 = (0 - n) % n;  // R mod n
         one_ = r1;
         r2_ = static_cast<std::uint64_t>(static_cast<u128>(r1) * r1 % n);
@@ -32,12 +36,6 @@ public:
         return reduce(static_cast<u128>(a) * b);
     }
     std::uint64_t toForm(std::uint64_t a) const { return mul(a % n_, r2_); }
-    std::uint64_t fromForm(std::uint64_t a) const { return reduce(a); }
-
-    std::uint64_t add(std::uint64_t a, std::uint64_t b) const {
-        const std::uint64_t s = a + b;  // no overflow: n < 2^63
-        return s >= n_ ? s - n_ : s;
-    }
 
     std::uint64_t pow(std::uint64_t base, std::uint64_t e) const {
         std::uint64_t result = one_;
@@ -59,7 +57,7 @@ private:
     }
 
     std::uint64_t n_;
-    std::uint64_t inv_ = 0;  // n^-1 mod 2^64
+    std::uint64_t inv_;      // n^-1 mod 2^64
     std::uint64_t one_ = 0;  // R mod n
     std::uint64_t r2_ = 0;   // R^2 mod n
 };

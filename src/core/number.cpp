@@ -1,9 +1,16 @@
+// The Number conversions and text forms. Conversions check the range before they scale, in
+// 128-bit integers, so an out-of-range value is refused instead of wrapping.
 #include "core/number.hpp"
 
 #include <cmath>
 #include <cstdio>
 
 namespace tarn {
+namespace {
+// Above every whole value of the type (and NaN fails the test too): the whole part of anything
+// below it fits 64 bits, and the exact range check follows.
+constexpr double kBeyondRange = 1e15;
+}  // namespace
 
 Number Number::fromWhole(std::int64_t whole) {
     if (whole > kMaxWhole || whole < -kMaxWhole - 1) throw std::overflow_error("Number overflow");
@@ -13,19 +20,13 @@ Number Number::fromWhole(std::int64_t whole) {
 Number Number::fromDouble(double value) {
     // Whole part and fraction apart: scaling the whole value in double precision would lose
     // the last digits of large numbers (they pass 2^53 once multiplied by 10 000).
-    if (!(std::fabs(value) < 1e15)) throw std::overflow_error("Number overflow");
+    if (!(std::fabs(value) < kBeyondRange)) throw std::overflow_error("Number overflow");
     const double whole = std::trunc(value);
     const double fraction = std::nearbyint((value - whole) * kScale);  // ties to even
     const __int128 raw = static_cast<__int128>(static_cast<std::int64_t>(whole)) * kScale +
                          static_cast<std::int64_t>(fraction);
     if (raw > INT64_MAX || raw < INT64_MIN) throw std::overflow_error("Number overflow");
     return fromRaw(static_cast<std::int64_t>(raw));
-}
-
-Number Number::operator+(Number other) const {
-    std::int64_t sum = 0;
-    if (__builtin_add_overflow(raw_, other.raw_, &sum)) throw std::overflow_error("Number overflow");
-    return fromRaw(sum);
 }
 
 std::string signedText(Number n) {

@@ -28,13 +28,8 @@ public:
     }
 
     constexpr std::int64_t raw() const { return raw_; }
-    double toDouble() const { return static_cast<double>(raw_) / kScale; }
     // Whole part toward zero.
     constexpr std::int64_t whole() const { return raw_ / kScale; }
-    constexpr bool isWhole() const { return raw_ % kScale == 0; }
-
-    // Exact addition; throws std::overflow_error when the sum leaves the range.
-    Number operator+(Number other) const;
 
     constexpr auto operator<=>(const Number&) const = default;
 

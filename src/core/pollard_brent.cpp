@@ -1,3 +1,5 @@
+// Pollard-Brent rho with products reduced lazily (no final compare) and two walks side by side,
+// so the multiplier never idles; the stop is read once per batch of steps.
 #include "core/pollard_brent.hpp"
 
 #include <array>
@@ -26,11 +28,7 @@ std::uint64_t binaryGcd(std::uint64_t a, std::uint64_t b) {
 // and needs no compare at all; residues are only congruent, which is all a gcd needs.
 class LazyMontgomery {
 public:
-    explicit LazyMontgomery(std::uint64_t n) : n_(n) {
-        std::uint64_t inv = n;
-        for (int i = 0; i < 5; ++i) inv *= 2 - n * inv;
-        negInv_ = 0 - inv;
-    }
+    explicit LazyMontgomery(std::uint64_t n) : n_(n), negInv_(0 - inverseMod2_64(n)) {}
     std::uint64_t mul(std::uint64_t a, std::uint64_t b) const {
         const u128 t = static_cast<u128>(a) * b;
         const auto tl = static_cast<std::uint64_t>(t);
@@ -46,7 +44,11 @@ private:
     std::uint64_t negInv_;
 };
 
+// Steps per gcd and per look at the stop: a binary gcd costs as much as a few dozen products,
+// and a batch that overshoots is walked again one step at a time, so neither cost shows.
 constexpr int kBatch = 128;
+// Where every walk starts; any residue serves.
+constexpr std::uint64_t kWalkStart = 2;
 // Walks that run side by side: each step of one walk waits on the last, so a few independent
 // walks fill the multiplier, and the first of them to find a factor ends the search sooner.
 constexpr int kWalks = 2;
@@ -61,7 +63,7 @@ std::uint64_t search(std::uint64_t n, std::uint64_t firstC, const StopSignal& st
     const LazyMontgomery mont(n);
     const std::uint64_t fourN = 4 * n;
     std::array<Walk, kWalks> walks;
-    for (int w = 0; w < kWalks; ++w) walks[w] = {firstC + w, 2, 2, 2, 1};
+    for (int w = 0; w < kWalks; ++w) walks[w] = {firstC + w, kWalkStart, kWalkStart, kWalkStart, 1};
     auto step = [&](std::uint64_t v, std::uint64_t c) { return mont.mul(v, v) + c; };
     // x and y lie in [0, 4n), so this is a positive residue of x - y below 8n.
     auto difference = [&](std::uint64_t x, std::uint64_t y) { return x + fourN - y; };

@@ -6,8 +6,12 @@
 #include <array>
 #include <cstdint>
 
+#include "core/montgomery.hpp"
+
 namespace tarn {
 
+// Division by these primes is cheaper than a rho walk for the small factors that most numbers
+// have; what is left has no factor below 2048, so a cofactor below 2048^2 is prime outright.
 inline constexpr std::uint32_t kTrialLimit = 2048;
 
 struct TrialPrime {
@@ -18,17 +22,21 @@ struct TrialPrime {
 
 namespace detail {
 
-constexpr bool isSmallPrime(std::uint32_t n) {
-    if (n < 2) return false;
-    for (std::uint32_t d = 2; d * d <= n; ++d) {
-        if (n % d == 0) return false;
+// Which numbers below kTrialLimit are composite, by a sieve of Eratosthenes.
+constexpr std::array<bool, kTrialLimit> compositesBelowTrialLimit() {
+    std::array<bool, kTrialLimit> composite{};
+    for (std::uint32_t p = 2; p * p < kTrialLimit; ++p) {
+        if (composite[p]) continue;
+        for (std::uint32_t m = p * p; m < kTrialLimit; m += p) composite[m] = true;
     }
-    return true;
+    return composite;
 }
+inline constexpr auto kCompositeBelowTrialLimit = compositesBelowTrialLimit();
 
 constexpr std::size_t countOddPrimes() {
     std::size_t count = 0;
-    for (std::uint32_t n = 3; n < kTrialLimit; n += 2) count += isSmallPrime(n) ? 1 : 0;
+    for (std::uint32_t n = 3; n < kTrialLimit; n += 2)
+        count += kCompositeBelowTrialLimit[n] ? 0 : 1;
     return count;
 }
 
@@ -36,10 +44,8 @@ constexpr auto makeTrialPrimes() {
     std::array<TrialPrime, countOddPrimes()> table{};
     std::size_t i = 0;
     for (std::uint32_t n = 3; n < kTrialLimit; n += 2) {
-        if (!isSmallPrime(n)) continue;
-        std::uint64_t inv = n;
-        for (int k = 0; k < 5; ++k) inv *= 2 - n * inv;
-        table[i++] = {n, inv, ~std::uint64_t{0} / n};
+        if (kCompositeBelowTrialLimit[n]) continue;
+        table[i++] = {n, inverseMod2_64(n), ~std::uint64_t{0} / n};
     }
     return table;
 }

@@ -1,3 +1,6 @@
+// Reads and writes the checkpoint line. The reader refuses a number that does not fit its field
+// instead of wrapping it; the writer goes through a synced temporary file and a rename, so a
+// crash leaves the old line or the new one.
 #include "generation/checkpoint_file.hpp"
 
 #include <fcntl.h>
@@ -8,9 +11,13 @@
 #include <cstring>
 
 #include "core/file_messages.hpp"
+#include "core/number.hpp"
 
 namespace tarn {
 namespace {
+
+// A checkpoint line is a few dozen bytes: one block reads it whole, anything else in a few.
+constexpr std::size_t kReadBlock = 4096;
 
 // One number as the reader takes it: blanks and line ends before it are skipped; it ends at a
 // blank, a comma or the end of a line.
@@ -56,7 +63,7 @@ int readWholeFile(const std::string& path, std::string& text) {
     const int fd = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
     if (fd < 0) return errno;
     int error = 0;
-    char block[4096];
+    char block[kReadBlock];
     for (;;) {
         const ssize_t got = ::read(fd, block, sizeof block);
         if (got > 0) {
@@ -92,7 +99,7 @@ CheckpointRead readCheckpoint(const std::string& path) {
     if (error == ENOENT) return {.status = Status::Missing};
     if (error != 0) return {.status = Status::Unreadable, .error = error};
     // Candidate and Limit are whole Numbers; Interrupted is a 16-bit integer.
-    constexpr std::int64_t kMaxWhole = INT64_MAX / 10000;
+    constexpr std::int64_t kMaxWhole = Number::kMaxWhole;
     std::size_t pos = 0;
     const auto candidate = nextNumber(text, pos, -kMaxWhole - 1, kMaxWhole);
     if (!candidate) return {.status = Status::Malformed};

@@ -1,3 +1,5 @@
+// The job's minimum and completion texts, built from the job's result alone so that the window
+// and the command line word them the same.
 #include "generation/job_texts.hpp"
 
 #include <algorithm>
@@ -9,10 +11,6 @@ namespace tarn {
 std::optional<std::string> checkGenerationMinimum(std::int64_t whole) {
     if (whole < kGenerationMinimum) return std::string(kMinimumMessage);
     return std::nullopt;
-}
-
-std::optional<std::string> checkGenerationMinimum(const Number& number) {
-    return checkGenerationMinimum(number.whole());
 }
 
 namespace {

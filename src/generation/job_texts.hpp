@@ -1,12 +1,11 @@
-// The messages of the generation job, word for word, and the job's own lower bound.
+// The messages of the generation job, word for word, and the job's own lower bound. Kept in one
+// place so that the window, the command line and the tests show the same words.
 #pragma once
 
 #include <cstdint>
 #include <optional>
 #include <string>
 #include <string_view>
-
-#include "core/number.hpp"
 
 namespace tarn {
 
@@ -15,6 +14,5 @@ inline constexpr std::string_view kMinimumMessage = "Minimum value is 100";
 
 // "Minimum value is 100" for a whole number below 100, nothing otherwise.
 std::optional<std::string> checkGenerationMinimum(std::int64_t whole);
-std::optional<std::string> checkGenerationMinimum(const Number& number);
 
 }  // namespace tarn

@@ -14,10 +14,16 @@ namespace tarn {
 
 namespace detail {
 
+// The last four digits are kept apart as a number below 10^4.
+inline constexpr std::uint64_t kLowModulus = 10000;
+// Room for the upper digits of any 64-bit number (at most 16 of them): a record copies this
+// fixed count of bytes whatever the digits' count, and the caller's buffer has room past them.
+inline constexpr std::size_t kUpperCopy = 16;
+
 struct FourDigits {
-    std::array<std::array<char, 4>, 10000> text;
+    std::array<std::array<char, 4>, kLowModulus> text;
     constexpr FourDigits() : text() {
-        for (int i = 0; i < 10000; ++i) {
+        for (std::size_t i = 0; i < kLowModulus; ++i) {
             text[i] = {static_cast<char>('0' + i / 1000), static_cast<char>('0' + i / 100 % 10),
                        static_cast<char>('0' + i / 10 % 10), static_cast<char>('0' + i % 10)};
         }
@@ -32,12 +38,12 @@ public:
 
     void add(std::uint64_t step) {
         low_ += step;
-        if (low_ >= 10000) set(high_ * 10000 + low_);
+        if (low_ >= kLowModulus) set(high_ * kLowModulus + low_);
     }
 
     char* write(char* out) const {
-        if (highLength_ == 0) return std::to_chars(out, out + 8, low_).ptr;
-        std::memcpy(out, upper_, 16);
+        if (highLength_ == 0) return std::to_chars(out, out + kUpperCopy, low_).ptr;
+        std::memcpy(out, upper_, kUpperCopy);
         out += highLength_;
         std::memcpy(out, kFourDigits.text[low_].data(), 4);
         return out + 4;
@@ -45,17 +51,18 @@ public:
 
 private:
     void set(std::uint64_t value) {
-        high_ = value / 10000;
-        low_ = value % 10000;
+        high_ = value / kLowModulus;
+        low_ = value % kLowModulus;
         highLength_ =
-            high_ == 0 ? 0
-                       : static_cast<int>(std::to_chars(upper_, upper_ + 16, high_).ptr - upper_);
+            high_ == 0
+                ? 0
+                : static_cast<int>(std::to_chars(upper_, upper_ + kUpperCopy, high_).ptr - upper_);
     }
 
     std::uint64_t high_ = 0;
     std::uint64_t low_ = 0;
     int highLength_ = 0;
-    char upper_[32] = {};
+    char upper_[kUpperCopy] = {};
 };
 
 }  // namespace detail

@@ -45,7 +45,7 @@ using scan::Key;
 // shorter than a prime gap, so only a handful of numbers are ever tested.
 std::optional<std::int64_t> firstPrimeAbove(std::int64_t low, std::int64_t high) {
     for (std::int64_t n = low < 1 ? 2 : low + 1; n <= high; ++n)
-        if (IsPrime64(static_cast<std::uint64_t>(n))) return n;
+        if (isPrime(static_cast<std::uint64_t>(n))) return n;
     return std::nullopt;
 }
 

@@ -10,6 +10,7 @@
 #include "core/entry.hpp"
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
+#include "core/wheel.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/file_names.hpp"
 #include "generation/results_scan.hpp"
@@ -22,6 +23,17 @@ ResumeResult refused(std::string message) {
     ResumeResult result;
     result.status = ResumeResult::Status::Refused;
     result.message = std::move(message);
+    return result;
+}
+
+// A failure of the resume itself, before the job ran; `message` is the whole "Info" text.
+ResumeResult failed(std::string message, const std::string& resultsPath) {
+    ResumeResult result;
+    result.status = ResumeResult::Status::Failed;
+    result.message = std::move(message);
+    result.job.status = JobResult::Status::Failed;
+    result.job.error = result.message;
+    result.job.resultsPath = resultsPath;
     return result;
 }
 
@@ -48,13 +60,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
         return resume(folder, stop, progress, events, hooks, threads);
     } catch (...) {
         // Reading and checking change no file, and the job guards its own writes.
-        ResumeResult result;
-        result.status = ResumeResult::Status::Failed;
-        result.message = unexpectedFailure(describeCurrentException());
-        result.job.status = JobResult::Status::Failed;
-        result.job.error = result.message;
-        result.job.resultsPath = folder + kResultsFileName;
-        return result;
+        return failed(unexpectedFailure(describeCurrentException()), folder + kResultsFileName);
     }
 }
 
@@ -76,7 +82,7 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     const std::int64_t limit = checkpoint->limit;
     if (resumePoint > limit) return refused(std::string(kImpossibleToResumeMessage));
     // Stopped jobs leave the last candidate of a complete turn, 30k + 7 with k >= 0.
-    if (resumePoint < 7 || resumePoint % 30 != 7)
+    if (resumePoint < kTurnEndResidue || resumePoint % kWheelPeriod != kTurnEndResidue)
         return refused(misalignedCheckpointRefusal(checkpointPath, resumePoint));
     if (limit > kUpperEntryWhole) return refused(limitOutOfRangeRefusal(checkpointPath, limit));
 
@@ -98,15 +104,8 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     // Records past the checkpoint and a torn last line were written after the last checkpoint
     // of a killed job; the turns that wrote them run again.
     if (scan.keptBytes < scan.fileBytes &&
-        ::truncate(resultsPath.c_str(), static_cast<off_t>(scan.keptBytes)) != 0) {
-        ResumeResult result;
-        result.status = ResumeResult::Status::Failed;
-        result.message = truncationFailure(resultsPath, systemReason(errno));
-        result.job.status = JobResult::Status::Failed;
-        result.job.error = result.message;
-        result.job.resultsPath = resultsPath;
-        return result;
-    }
+        ::truncate(resultsPath.c_str(), static_cast<off_t>(scan.keptBytes)) != 0)
+        return failed(truncationFailure(resultsPath, systemReason(errno)), resultsPath);
 
     const ResumeStart start{limit, resumePoint, scan.records, scan.enumerated};
     if (events.onContinuing) events.onContinuing(start);
@@ -116,7 +115,7 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     spec.limit = limit;
     spec.enumerated = scan.enumerated;
     spec.append = true;
-    spec.firstTurn = resumePoint + 4;
+    spec.firstTurn = resumePoint + kLastToNextTurn;
     spec.primeCountBefore = scan.records;
     spec.threads = threads;
 

@@ -11,13 +11,9 @@
 #include <cstdint>
 #include <vector>
 
+#include "core/wheel.hpp"
+
 namespace tarn {
-
-inline constexpr std::array<std::uint32_t, 8> kTurnOffsets{0, 2, 6, 8, 12, 18, 20, 26};
-
-inline constexpr std::int64_t turnStart(std::int64_t turn) { return 30 * turn + 11; }
-// The index of the turn whose start is `start` (a number 30k + 11).
-inline constexpr std::int64_t turnIndex(std::int64_t start) { return (start - 11) / 30; }
 
 class WheelSieve {
 public:
@@ -32,7 +28,6 @@ public:
     // one sieve can serve segments far apart: small primes by a remainder, large ones that have
     // fallen behind by a division each.
     void skipTo(std::int64_t turn);
-    std::int64_t nextTurn() const { return turn_; }
 
 private:
     struct Small {
@@ -49,11 +44,5 @@ private:
     std::vector<Small> small_;
     std::vector<Large> large_;
 };
-
-// The odd primes from 7 up to `bound`, by a plain sieve of odd numbers.
-std::vector<std::uint32_t> sievingPrimes(std::uint32_t bound);
-
-// The whole part of the square root, exact for every 64-bit value.
-std::uint64_t wholeSqrt(std::uint64_t n);
 
 }  // namespace tarn

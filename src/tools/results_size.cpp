@@ -1,3 +1,5 @@
+// The size figure of the results file, counted in whole hundredths in 128-bit integers so that
+// it is cut (never rounded) exactly for any 64-bit size.
 #include "tools/results_size.hpp"
 
 #include <filesystem>
@@ -5,14 +7,23 @@
 #include "core/number.hpp"
 
 namespace tarn {
+namespace {
+
+constexpr std::uint64_t kBytesPerMegabyte = 1048576;
+constexpr unsigned kHundredths = 100;  // the figure keeps two decimals
+// Above this many megabytes the window asks before it opens the file in the text editor; the
+// question quotes the same figure ("bigger than 10 MB").
+constexpr double kLargeFigure = 10.0;
+
+}  // namespace
 
 double sizeFigure(std::uint64_t bytes) {
-    // Whole hundredths of a megabyte, computed in integers so that any 64-bit size is exact.
-    const unsigned __int128 hundredths = static_cast<unsigned __int128>(bytes) * 100 / 1048576;
-    return static_cast<double>(hundredths) / 100.0;
+    const unsigned __int128 hundredths =
+        static_cast<unsigned __int128>(bytes) * kHundredths / kBytesPerMegabyte;
+    return static_cast<double>(hundredths) / kHundredths;
 }
 
-bool isLargeFigure(double figure) { return figure > 10.0; }
+bool isLargeFigure(double figure) { return figure > kLargeFigure; }
 
 std::string megabyteText(double figure) { return doubleText(figure); }
 

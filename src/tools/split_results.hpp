@@ -13,6 +13,8 @@
 
 namespace tarn {
 
+// Bytes read at once: enough that the system calls cost little next to the copy, and a constant
+// memory whatever the file's size.
 inline constexpr std::size_t kSplitBlockSize = std::size_t{1} << 20;
 // Small pieces for one output file are gathered up to this many bytes; pieces of half of it
 // or more go to the system directly.

@@ -7,7 +7,7 @@
 
 #include <random>
 
-#include "core/trial_division.hpp"
+#include "core/miller_rabin.hpp"
 
 using namespace tarn;
 
@@ -41,8 +41,7 @@ void expectSound(std::int64_t n) {
     std::uint64_t previous = 1;
     for (const FactorEntry& e : list) {
         ASSERT_GT(e.prime, previous) << n;
-        // CheckPrime keeps the trial division's verdict on 2 (not prime), so 2 is taken apart.
-        ASSERT_TRUE(e.prime == 2 || CheckPrime(static_cast<std::int64_t>(e.prime))) << n;
+        ASSERT_TRUE(isPrime(e.prime)) << n;
         ASSERT_GE(e.exponent, 1u);
         for (unsigned i = 0; i < e.exponent; ++i) product *= e.prime;
         previous = e.prime;
@@ -53,7 +52,8 @@ void expectSound(std::int64_t n) {
 std::vector<std::uint64_t> primesFrom(std::int64_t start, int count) {
     std::vector<std::uint64_t> out;
     for (std::int64_t p = start; static_cast<int>(out.size()) < count; ++p)
-        if (p > 2 && CheckPrime(p)) out.push_back(static_cast<std::uint64_t>(p));
+        if (p > 2 && isPrime(static_cast<std::uint64_t>(p)))
+            out.push_back(static_cast<std::uint64_t>(p));
     return out;
 }
 
@@ -110,9 +110,9 @@ TEST(FactorizeNumber, HardCases) {
 }
 
 TEST(FactorizeNumber, ResultLines) {
-    for (const char* line : {"2 = 2", "12 = 2^2 * 3", "18 = 2 * 3^2", "97 = 97",
-                             "360 = 2^3 * 3^2 * 5", "1001 = 7 * 11 * 13", "1024 = 2^10",
-                             "50 = 2 * 5^2", "421053653 = 20149 * 20897"}) {
+    for (const char* line :
+         {"2 = 2", "12 = 2^2 * 3", "18 = 2 * 3^2", "97 = 97", "360 = 2^3 * 3^2 * 5",
+          "1001 = 7 * 11 * 13", "1024 = 2^10", "50 = 2 * 5^2", "421053653 = 20149 * 20897"}) {
         const std::int64_t n = std::stoll(line);
         EXPECT_EQ(factorizationLine(n, factors(n)), line);
     }
