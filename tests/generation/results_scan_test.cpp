@@ -81,7 +81,7 @@ ResultsScan referenceScan(const std::string& file, std::int64_t resumePoint) {
     if (scan.records == 0)
         return damaged("holds no records at or below " + std::to_string(resumePoint));
     for (std::int64_t n = scan.lastPrime + 1; n <= resumePoint; ++n)
-        if (IsPrime64(static_cast<std::uint64_t>(n)))
+        if (isPrime(static_cast<std::uint64_t>(n)))
             return damaged("ends with " + std::to_string(scan.lastPrime) + ", but the prime " +
                            std::to_string(n) + " is missing before the checkpoint's candidate " +
                            std::to_string(resumePoint));
@@ -150,7 +150,7 @@ Draft randomDraft(Random& random) {
     const int digits = static_cast<int>(uniform(random, 2, 18));
     draft.resumePoint = uniform(random, power10(digits - 1), power10(digits) - 1);
     std::int64_t last = draft.resumePoint;
-    while (!IsPrime64(static_cast<std::uint64_t>(last))) --last;
+    while (!isPrime(static_cast<std::uint64_t>(last))) --last;
     std::vector<std::int64_t> values;
     for (int i = static_cast<int>(uniform(random, 0, 40)); i > 0; --i) {
         const int length = static_cast<int>(uniform(random, 1, digits));
