@@ -157,7 +157,7 @@ void ChunkProducer::publish(std::int64_t index, std::int64_t recordsAfter) {
 void ChunkProducer::format(const Claim& chunk, std::int64_t reached,
                            const std::vector<std::uint8_t>& sieved, std::int64_t before,
                            std::int64_t count, RecordBuffer& buffer) const {
-    const auto lastCandidate = static_cast<std::uint64_t>(turnStart(reached) - 4);
+    const auto lastCandidate = static_cast<std::uint64_t>(turnStart(reached) - kLastToNextTurn);
     const std::size_t longest =
         static_cast<std::size_t>(decimalDigits(lastCandidate)) + 2 +
         (plan_.enumerated ? static_cast<std::size_t>(decimalDigits(before + count)) + 1 : 0);

@@ -26,6 +26,7 @@ namespace tarn {
 namespace {
 
 constexpr std::int64_t kSegmentTurns = 32 * 1024;  // 32 KiB of sieve: the first-level cache
+constexpr std::int64_t kSeedCount = 4;             // 2, 3, 5 and 7 come before the first turn
 constexpr std::int64_t kSegmentsPerChunk = 4;      // 2 to 5 MiB of records per write
 // Memory for the sieving threads' own state and their buffers, whatever the core count.
 constexpr std::uint64_t kThreadBudget = 48u << 20;
@@ -42,6 +43,20 @@ int sievingThreads(int requested, std::int64_t limit, std::int64_t chunkTurns) {
         static_cast<std::uint64_t>(chunkTurns) * (kChunkRecordBytes + 1);
     const auto fit = static_cast<int>(kThreadBudget / (sieveBytes + 2 * chunkBytes));
     return std::clamp(threads, 1, std::max(fit, 1));
+}
+
+// A fresh file starts with the records of 2, 3, 5 and 7, which no turn holds.
+void handSeeds(WritePipeline& pipeline, bool enumerated) {
+    RecordBuffer* seeds = pipeline.take();
+    if (!seeds) return;
+    char* out = seeds->reserve(kSeedCount * RecordFormatter::kMaxRecord);
+    RecordFormatter formatter(0, 0, enumerated);
+    for (const std::uint64_t seed : {2, 3, 5, 7}) out = formatter.put(out, seed);
+    seeds->size = static_cast<std::size_t>(out - seeds->data.get());
+    seeds->sequence = 0;
+    seeds->lastCandidate = 7;
+    seeds->primeCount = kSeedCount;
+    pipeline.hand(seeds);
 }
 
 // The whole "Info" message for the first failure.
@@ -81,7 +96,7 @@ JobResult recover(ResultsSink& sink, FileMark keep, FileMark durable, const JobS
     sink.close();
     // A fresh job without even its seed records on the disk has nothing to continue.
     const Checkpoint checkpoint = !spec.append && keep.primeCount == 0
-                                      ? Checkpoint{11, spec.limit, 0}
+                                      ? Checkpoint{kFirstTurnStart, spec.limit, 0}
                                       : Checkpoint{keep.candidate, spec.limit, 1};
     result.candidate = checkpoint.candidate;
     result.primeCount = keep.primeCount;
@@ -95,14 +110,16 @@ JobResult recover(ResultsSink& sink, FileMark keep, FileMark durable, const JobS
 JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress,
                         const JobHooks& hooks, JobResult& result) {
     const std::string checkpointPath = spec.folder + kCheckpointFileName;
-    const std::int64_t firstTurnStart = spec.append ? spec.firstTurn : 11;
-    if (firstTurnStart < 11 || (firstTurnStart - 11) % 30 != 0) {
+    const std::int64_t firstTurnStart = spec.append ? spec.firstTurn : kFirstTurnStart;
+    if (firstTurnStart < kFirstTurnStart ||
+        (firstTurnStart - kFirstTurnStart) % kWheelPeriod != 0) {
         result.error = "The job cannot start at " + std::to_string(firstTurnStart) +
                        ", which is not the start of a wheel turn.";
         return result;
     }
     const std::int64_t first = turnIndex(firstTurnStart);
-    const std::int64_t end = std::max(first, spec.limit >= 11 ? turnIndex(spec.limit) + 1 : 0);
+    const std::int64_t end =
+        std::max(first, spec.limit >= kFirstTurnStart ? turnIndex(spec.limit) + 1 : 0);
 
     // The first thread's sieve is built before any file is touched: at the top of the range it
     // is the job's largest piece of memory.
@@ -126,9 +143,9 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
     }
 
     // A fresh file holds nothing yet; a continued one every prime before the first turn.
-    const FileMark start = spec.append
-                               ? FileMark{sink->size(), firstTurnStart - 4, spec.primeCountBefore}
-                               : FileMark{0, 0, 0};
+    const FileMark start = spec.append ? FileMark{sink->size(), firstTurnStart - kLastToNextTurn,
+                                                  spec.primeCountBefore}
+                                       : FileMark{0, 0, 0};
     if (progress) {
         progress->candidate.store(firstTurnStart, std::memory_order_relaxed);
         progress->primeCount.store(start.primeCount, std::memory_order_relaxed);
@@ -138,7 +155,7 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
     plan.firstTurn = first;
     plan.endTurn = end;
     plan.limit = spec.limit;
-    plan.recordsBefore = spec.append ? spec.primeCountBefore : 4;
+    plan.recordsBefore = spec.append ? spec.primeCountBefore : kSeedCount;
     plan.firstSequence = spec.append ? 0 : 1;
     plan.enumerated = spec.enumerated;
     plan.segmentTurns = hooks.turnsPerBatch > 0 ? hooks.turnsPerBatch : kSegmentTurns;
@@ -152,17 +169,7 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
                                progress);
         try {
             pipeline.start();
-            if (!spec.append) {
-                RecordBuffer* seeds = pipeline.take();
-                char* out = seeds->reserve(4 * RecordFormatter::kMaxRecord);
-                RecordFormatter formatter(0, 0, spec.enumerated);
-                for (const std::uint64_t seed : {2, 3, 5, 7}) out = formatter.put(out, seed);
-                seeds->size = static_cast<std::size_t>(out - seeds->data.get());
-                seeds->sequence = 0;
-                seeds->lastCandidate = 7;
-                seeds->primeCount = 4;
-                pipeline.hand(seeds);
-            }
+            if (!spec.append) handSeeds(pipeline, spec.enumerated);
             ChunkProducer producer(plan, pipeline, stop, hooks, progress);
             producer.start(threads, std::move(*sieve));
             producer.join();
@@ -180,7 +187,7 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
         }
     }
     // The file ends after the last whole turn written; short of the end, the job was stopped.
-    const bool stopped = written.candidate + 4 < turnStart(end);
+    const bool stopped = written.candidate + kLastToNextTurn < turnStart(end);
 
     if (const int error = hooks.durable ? sink->sync() : 0; error != 0) {
         // The system could not confirm the records: claim none past the last flush.
@@ -216,7 +223,7 @@ JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progr
     JobResult result;
     result.limit = spec.limit;
     result.resultsPath = spec.folder + kResultsFileName;
-    result.candidate = (spec.append ? spec.firstTurn : 11) - 4;
+    result.candidate = (spec.append ? spec.firstTurn : kFirstTurnStart) - kLastToNextTurn;
     result.primeCount = spec.append ? spec.primeCountBefore : 0;
     try {
         return runGuardedJob(spec, stop, progress, hooks, result);
