@@ -6,7 +6,7 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/entry_batch.hpp"
-#include "core/command_texts.hpp"
+#include "core/verdict_texts.hpp"
 #include "core/factorization.hpp"
 #include "core/trial_division.hpp"
 #include "core/verdicts.hpp"

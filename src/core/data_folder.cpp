@@ -5,7 +5,7 @@
 #include <system_error>
 
 #include "core/app_folder.hpp"
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 
 #ifdef _WIN32
 #include <windows.h>

@@ -11,7 +11,7 @@
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
 #include "generation/checkpoint_file.hpp"
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 #include "generation/results_scan.hpp"
 #include "generation/resume_texts.hpp"
 
@@ -53,7 +53,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
         result.message = unexpectedFailure(describeCurrentException());
         result.job.status = JobResult::Status::Failed;
         result.job.error = result.message;
-        result.job.resultsPath = folder + kResultsFileName;
+        result.job.resultsPath = resultsFilePath(folder);
         return result;
     }
 }
@@ -62,8 +62,8 @@ namespace {
 
 ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
                     const ResumeEvents& events, const JobHooks& hooks, int threads) {
-    const std::string checkpointPath = folder + kCheckpointFileName;
-    const std::string resultsPath = folder + kResultsFileName;
+    const std::string checkpointPath = checkpointFilePath(folder);
+    const std::string resultsPath = resultsFilePath(folder);
 
     const CheckpointRead read = readCheckpoint(checkpointPath);
     if (read.status == CheckpointRead::Status::Missing) return {};

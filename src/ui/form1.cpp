@@ -4,7 +4,7 @@
 #include <QLocale>
 
 #include "core/app_folder.hpp"
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 #include "ui/designed_font.hpp"
 #include "ui/message_box.hpp"
 #include "ui/shell.hpp"

@@ -2,7 +2,7 @@
 // times a second and reports its outcome once the worker has finished with the files.
 #include <QProgressBar>
 
-#include "core/command_texts.hpp"
+#include "ui/window_texts.hpp"
 #include "core/entry.hpp"
 #include "generation/job_texts.hpp"
 #include "generation/resume_job.hpp"

@@ -1,6 +1,8 @@
 // Test, Factorize and "Cancel all calculations". The test and the factorization run on a
 // worker; one of them at a time, so that two results never race into the status line.
-#include "core/command_texts.hpp"
+#include "core/verdict_texts.hpp"
+#include "generation/job_texts.hpp"
+#include "ui/window_texts.hpp"
 #include "core/entry.hpp"
 #include "core/factorization.hpp"
 #include "core/trial_division.hpp"

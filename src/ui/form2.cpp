@@ -4,7 +4,7 @@
 #include <QLocale>
 #include <QtConcurrent/QtConcurrentRun>
 
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 #include "tools/split_entry.hpp"
 #include "ui/folder_list.hpp"
 #include "ui_form2.h"
@@ -80,7 +80,7 @@ void Form2::Command1_Click() {
         messages_.show(kSplitWhileJobMessage, "Info");
         return;
     }
-    const std::string input = programFolder_ + kResultsFileName;
+    const std::string input = resultsFilePath(programFolder_);
     const std::string prefix = splitNamePrefix(ui_->Label1->text().toStdString());
     const EntryResult count =
         parseRecordsPerFile(ui_->Text1->text().toStdString(), decimalSeparator());
