@@ -6,9 +6,9 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/entry_batch.hpp"
-#include "core/verdict_texts.hpp"
 #include "core/factorization.hpp"
 #include "core/trial_division.hpp"
+#include "core/verdict_texts.hpp"
 #include "core/verdicts.hpp"
 
 namespace tarn::cli {

@@ -25,8 +25,8 @@ int runSplit(const SplitArguments& args, Context& ctx) {
     }
     const auto lock = lockFolder(ctx);
     if (!lock) return kRefused;
-    const SplitResult r = splitResultsFile(
-        resultsFilePath(ctx.folder), splitNamePrefix(args.into), count.number->whole(), ctx.stop);
+    const SplitResult r = splitResultsFile(resultsFilePath(ctx.folder), splitNamePrefix(args.into),
+                                           count.number->whole(), ctx.stop);
     if (r.status == SplitStatus::Failed) {
         std::cerr << r.message << '\n';
         return kIoFailure;

@@ -17,8 +17,8 @@
 
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
-#include "generation/chunk_producer.hpp"
 #include "core/file_names.hpp"
+#include "generation/chunk_producer.hpp"
 #include "generation/record_formatter.hpp"
 #include "generation/wheel_sieve.hpp"
 #include "generation/write_pipeline.hpp"

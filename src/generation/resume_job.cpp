@@ -10,8 +10,8 @@
 #include "core/entry.hpp"
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
-#include "generation/checkpoint_file.hpp"
 #include "core/file_names.hpp"
+#include "generation/checkpoint_file.hpp"
 #include "generation/results_scan.hpp"
 #include "generation/resume_texts.hpp"
 

@@ -3,8 +3,8 @@
 #include "generation/startup_check.hpp"
 
 #include "core/file_messages.hpp"
-#include "generation/checkpoint_file.hpp"
 #include "core/file_names.hpp"
+#include "generation/checkpoint_file.hpp"
 
 namespace tarn {
 
