@@ -5,7 +5,7 @@
 #include "tools/results_size.hpp"
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"
-#include "ui/shell.hpp"
+#include "ui/shell/shell.hpp"
 #include "ui_form1.h"
 
 namespace tarn::ui {
