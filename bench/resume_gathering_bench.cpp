@@ -15,7 +15,7 @@
 #include <memory>
 #include <string>
 
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 #include "generation/generation_job.hpp"
 #include "generation/results_scan.hpp"
 
@@ -48,7 +48,7 @@ struct JobFile {
         std::string pattern = std::string(tmp && *tmp ? tmp : "/tmp") + "/tarn-bench-XXXXXX";
         if (!::mkdtemp(pattern.data())) std::abort();
         folder = pattern + "/";
-        path = folder + tarn::kResultsFileName;
+        path = tarn::resultsFilePath(folder);
         tarn::JobSpec spec;
         spec.folder = folder;
         spec.limit = upTo;

@@ -4,16 +4,10 @@
 
 #include "core/app_folder.hpp"
 #include "core/data_folder.hpp"
-#ifdef _WIN32
-#include "platform/windows_shell.hpp"
-#else
-#include "ui/desktop_shell.hpp"
-#endif
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"
-#ifndef _WIN32
+#include "ui/shell/desktop_shell.hpp"
 #include "ui/termination_signals.hpp"
-#endif
 
 int main(int argc, char** argv) {
     QApplication app(argc, argv);
@@ -22,20 +16,12 @@ int main(int argc, char** argv) {
     QApplication::setDesktopFileName("tarn");
 
     tarn::ui::QtMessageBox messages;
-#ifdef _WIN32
-    tarn::platform::WindowsShell shell;
-#else
-    tarn::ui::DesktopShell shell;
-#endif
+    const std::unique_ptr<tarn::ui::DesktopShell> shell = tarn::ui::makeDesktopShell();
     const std::string programFolder = tarn::AppFolder();
-    tarn::ui::Form1 window(messages, shell, tarn::dataFolder(programFolder));
+    tarn::ui::Form1 window(messages, *shell, tarn::dataFolder(programFolder));
     window.setReadmePath(tarn::readmePath(programFolder));
     messages.setParent(&window);
-#ifdef _WIN32
-    shell.setOwner(reinterpret_cast<void*>(window.winId()));
-#else
-    shell.setDialogParent(&window);
-#endif
+    shell->setOwner(window);
     // The program ends when the main window has really closed, which waits for a running job
     // to leave through its stop path; the split window alone does not keep it alive.
     QApplication::setQuitOnLastWindowClosed(false);
@@ -44,9 +30,7 @@ int main(int argc, char** argv) {
     // Logging off or shutting down closes the window like the user does.
     QObject::connect(&app, &QGuiApplication::commitDataRequest, &window,
                      [&window](QSessionManager&) { window.close(); });
-#ifndef _WIN32
     tarn::ui::closeOnTerminationSignals(window);
-#endif
     window.Form_Load();
     window.show();
     return QApplication::exec();

@@ -9,7 +9,6 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/standard_output.hpp"
-#include "core/command_texts.hpp"
 #include "generation/job_texts.hpp"
 
 namespace tarn::cli {

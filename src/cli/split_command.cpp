@@ -5,7 +5,7 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/standard_output.hpp"
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 #include "tools/split_entry.hpp"
 #include "tools/split_results.hpp"
 
@@ -25,8 +25,8 @@ int runSplit(const SplitArguments& args, Context& ctx) {
     }
     const auto lock = lockFolder(ctx);
     if (!lock) return kRefused;
-    const SplitResult r = splitResultsFile(
-        ctx.folder + kResultsFileName, splitNamePrefix(args.into), count.number->whole(), ctx.stop);
+    const SplitResult r = splitResultsFile(resultsFilePath(ctx.folder), splitNamePrefix(args.into),
+                                           count.number->whole(), ctx.stop);
     if (r.status == SplitStatus::Failed) {
         std::cerr << r.message << '\n';
         return kIoFailure;

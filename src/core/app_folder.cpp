@@ -3,39 +3,12 @@
 #include <filesystem>
 #include <system_error>
 
-#ifdef _WIN32
-#include <windows.h>
-#endif
+#include "core/path_text.hpp"
+#include "platform/platform.hpp"
 
 namespace fs = std::filesystem;
 
 namespace tarn {
-
-#ifdef _WIN32
-namespace {
-
-// The full path of the running program; the buffer grows until the path fits.
-fs::path modulePath() {
-    std::wstring buffer(MAX_PATH, L'\0');
-    for (;;) {
-        const DWORD size = static_cast<DWORD>(buffer.size());
-        const DWORD n = GetModuleFileNameW(nullptr, buffer.data(), size);
-        if (n == 0) return {};
-        if (n < buffer.size()) {
-            buffer.resize(n);
-            return fs::path(buffer);
-        }
-        buffer.resize(buffer.size() * 2);
-    }
-}
-
-std::string utf8(const fs::path& path) {
-    const std::u8string text = path.u8string();
-    return std::string(reinterpret_cast<const char*>(text.data()), text.size());
-}
-
-}  // namespace
-#endif
 
 std::string withTrailingSeparator(std::string folder) {
     if (folder.empty() || folder.back() != kPathSeparator) folder += kPathSeparator;
@@ -44,15 +17,9 @@ std::string withTrailingSeparator(std::string folder) {
 
 std::string AppFolder() {
     std::error_code ec;
-#ifdef _WIN32
-    const fs::path exe = modulePath();
+    const fs::path exe = platform::programPath();
     if (exe.empty()) return withTrailingSeparator(utf8(fs::current_path(ec)));
     return withTrailingSeparator(utf8(exe.parent_path()));
-#else
-    fs::path exe = fs::read_symlink("/proc/self/exe", ec);
-    if (ec || exe.empty()) return withTrailingSeparator(fs::current_path(ec).string());
-    return withTrailingSeparator(exe.parent_path().string());
-#endif
 }
 
 bool FileExists(const std::string& name) {

@@ -5,13 +5,11 @@
 
 #include <string>
 
+#include "platform/path_separator.hpp"
+
 namespace tarn {
 
-#ifdef _WIN32
-inline constexpr char kPathSeparator = '\\';
-#else
-inline constexpr char kPathSeparator = '/';
-#endif
+inline constexpr char kPathSeparator = platform::kPathSeparator;
 
 // The folder of the running program with exactly one trailing separator.
 std::string AppFolder();

@@ -16,8 +16,8 @@
 
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
+#include "core/file_names.hpp"
 #include "generation/chunk_producer.hpp"
-#include "generation/file_names.hpp"
 #include "generation/record_formatter.hpp"
 #include "generation/wheel_sieve.hpp"
 #include "generation/write_pipeline.hpp"
@@ -80,7 +80,7 @@ std::string failureMessage(const PipelineFailure& failure, const std::string& re
 // during the job saw on the disk when the file cannot be cut or flushed.
 JobResult recover(ResultsSink& sink, FileMark keep, FileMark durable, const JobSpec& spec,
                   const JobHooks& hooks, const PipelineFailure& failure, JobResult result) {
-    const std::string checkpointPath = spec.folder + kCheckpointFileName;
+    const std::string checkpointPath = checkpointFilePath(spec.folder);
     result.status = JobResult::Status::Failed;
     result.error = failureMessage(failure, result.resultsPath, checkpointPath);
     if (const int cut = sink.truncate(keep.bytes); cut != 0) {
@@ -109,7 +109,7 @@ JobResult recover(ResultsSink& sink, FileMark keep, FileMark durable, const JobS
 
 JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress,
                         const JobHooks& hooks, JobResult& result) {
-    const std::string checkpointPath = spec.folder + kCheckpointFileName;
+    const std::string checkpointPath = checkpointFilePath(spec.folder);
     const std::int64_t firstTurnStart = spec.append ? spec.firstTurn : kFirstTurnStart;
     if (firstTurnStart < kFirstTurnStart ||
         (firstTurnStart - kFirstTurnStart) % kWheelPeriod != 0) {
@@ -222,7 +222,7 @@ JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progr
                  const JobHooks& hooks) {
     JobResult result;
     result.limit = spec.limit;
-    result.resultsPath = spec.folder + kResultsFileName;
+    result.resultsPath = resultsFilePath(spec.folder);
     result.candidate = (spec.append ? spec.firstTurn : kFirstTurnStart) - kLastToNextTurn;
     result.primeCount = spec.append ? spec.primeCountBefore : 0;
     try {

@@ -10,9 +10,9 @@
 #include "core/entry.hpp"
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
+#include "core/file_names.hpp"
 #include "core/wheel.hpp"
 #include "generation/checkpoint_file.hpp"
-#include "generation/file_names.hpp"
 #include "generation/results_scan.hpp"
 #include "generation/resume_texts.hpp"
 
@@ -60,7 +60,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
         return resume(folder, stop, progress, events, hooks, threads);
     } catch (...) {
         // Reading and checking change no file, and the job guards its own writes.
-        return failed(unexpectedFailure(describeCurrentException()), folder + kResultsFileName);
+        return failed(unexpectedFailure(describeCurrentException()), resultsFilePath(folder));
     }
 }
 
@@ -68,8 +68,8 @@ namespace {
 
 ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
                     const ResumeEvents& events, const JobHooks& hooks, int threads) {
-    const std::string checkpointPath = folder + kCheckpointFileName;
-    const std::string resultsPath = folder + kResultsFileName;
+    const std::string checkpointPath = checkpointFilePath(folder);
+    const std::string resultsPath = resultsFilePath(folder);
 
     const CheckpointRead read = readCheckpoint(checkpointPath);
     if (read.status == CheckpointRead::Status::Missing) return {};

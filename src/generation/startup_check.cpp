@@ -3,13 +3,13 @@
 #include "generation/startup_check.hpp"
 
 #include "core/file_messages.hpp"
+#include "core/file_names.hpp"
 #include "generation/checkpoint_file.hpp"
-#include "generation/file_names.hpp"
 
 namespace tarn {
 
 StartupCheck checkCheckpointAtStartup(const std::string& folder) {
-    const std::string path = folder + kCheckpointFileName;
+    const std::string path = checkpointFilePath(folder);
     const CheckpointRead read = readCheckpoint(path);
     switch (read.status) {
         case CheckpointRead::Status::Unreadable:

@@ -1,13 +1,12 @@
 #include "ui/form1.hpp"
 
 #include <QCloseEvent>
-#include <QLocale>
 
 #include "core/app_folder.hpp"
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 #include "ui/designed_font.hpp"
 #include "ui/message_box.hpp"
-#include "ui/shell.hpp"
+#include "ui/shell/shell.hpp"
 #include "ui_form1.h"
 
 namespace tarn::ui {
@@ -50,12 +49,6 @@ Form1::Form1(MessageBox& messages, Shell& shell, std::string folder, QWidget* pa
 }
 
 Form1::~Form1() { delete splitWindow_; }
-
-char Form1::decimalSeparator() const {
-    const QString point = QLocale().decimalPoint();
-    return point.size() == 1 && point[0].unicode() < 128 ? static_cast<char>(point[0].unicode())
-                                                         : '.';
-}
 
 void Form1::reportLaunch(const std::string& failure) {
     if (!failure.empty()) messages_.show(failure, "Info", MessageBox::Buttons::Ok);

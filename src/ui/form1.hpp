@@ -74,7 +74,6 @@ private:
     enum class OpenMode { OnRequest, AfterJob };
     void OpenResultsFile(OpenMode mode, const std::string& path);
     void reportLaunch(const std::string& failure);
-    char decimalSeparator() const;
 
     // Test and Factorize.
     void finishTest(std::int64_t number, int code);

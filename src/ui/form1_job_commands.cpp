@@ -2,15 +2,16 @@
 // times a second and reports its outcome once the worker has finished with the files.
 #include <QProgressBar>
 
-#include "core/command_texts.hpp"
 #include "core/entry.hpp"
 #include "generation/job_texts.hpp"
 #include "generation/resume_job.hpp"
 #include "generation/resume_texts.hpp"
 #include "generation/startup_check.hpp"
+#include "ui/decimal_separator.hpp"
 #include "ui/form1.hpp"
 #include "ui/form2.hpp"
 #include "ui/message_box.hpp"
+#include "ui/window_texts.hpp"
 #include "ui/worker.hpp"
 #include "ui_form1.h"
 

@@ -1,12 +1,15 @@
 // Test, Factorize and "Cancel all calculations". The test and the factorization run on a
 // worker; one of them at a time, so that two results never race into the status line.
-#include "core/command_texts.hpp"
 #include "core/entry.hpp"
 #include "core/factorization.hpp"
 #include "core/trial_division.hpp"
+#include "core/verdict_texts.hpp"
 #include "core/verdicts.hpp"
+#include "generation/job_texts.hpp"
+#include "ui/decimal_separator.hpp"
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"
+#include "ui/window_texts.hpp"
 #include "ui/worker.hpp"
 #include "ui_form1.h"
 

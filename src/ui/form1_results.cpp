@@ -1,16 +1,16 @@
 // Handing the results file to another program: the text editor, or for a large file (after
 // the user cancels the question) a program the user picks.
 #include "core/app_folder.hpp"
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 #include "tools/results_size.hpp"
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"
-#include "ui/shell.hpp"
+#include "ui/shell/shell.hpp"
 #include "ui_form1.h"
 
 namespace tarn::ui {
 
-void Form1::show_Click() { OpenResultsFile(OpenMode::OnRequest, folder_ + kResultsFileName); }
+void Form1::show_Click() { OpenResultsFile(OpenMode::OnRequest, resultsFilePath(folder_)); }
 
 void Form1::OpenResultsFile(OpenMode mode, const std::string& path) {
     // An unchecked "Open results when finished" means the user wants nothing opened.

@@ -1,23 +1,16 @@
 #include "ui/form2.hpp"
 
 #include <QCloseEvent>
-#include <QLocale>
 #include <QtConcurrent/QtConcurrentRun>
 
-#include "generation/file_names.hpp"
+#include "core/file_names.hpp"
 #include "tools/split_entry.hpp"
+#include "ui/decimal_separator.hpp"
 #include "ui/folder_list.hpp"
 #include "ui_form2.h"
 
 namespace tarn::ui {
 namespace {
-
-// The entry's decimal separator as one character; the point when the locale's is wider.
-char decimalSeparator() {
-    const QString point = QLocale().decimalPoint();
-    return point.size() == 1 && point[0].unicode() < 128 ? static_cast<char>(point[0].unicode())
-                                                         : '.';
-}
 
 // As close to the classic 8-point dialog font as the platform offers.
 QFont dialogFont(const QFont& base) {
@@ -80,7 +73,7 @@ void Form2::Command1_Click() {
         messages_.show(kSplitWhileJobMessage, "Info");
         return;
     }
-    const std::string input = programFolder_ + kResultsFileName;
+    const std::string input = resultsFilePath(programFolder_);
     const std::string prefix = splitNamePrefix(ui_->Label1->text().toStdString());
     const EntryResult count =
         parseRecordsPerFile(ui_->Text1->text().toStdString(), decimalSeparator());

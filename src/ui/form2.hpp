@@ -13,7 +13,7 @@
 #include "core/stop_signal.hpp"
 #include "tools/split_results.hpp"
 #include "ui/message_box.hpp"
-#include "ui/shell.hpp"
+#include "ui/shell/shell.hpp"
 
 namespace Ui {
 class Form2;

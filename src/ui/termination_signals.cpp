@@ -1,6 +1,16 @@
 #include "ui/termination_signals.hpp"
 
-#ifndef _WIN32
+#ifdef _WIN32
+
+namespace tarn::ui {
+
+// Windows sends a desktop program none of these signals: the end of a session reaches the window
+// as the application's commitDataRequest.
+void closeOnTerminationSignals(QWidget&) {}
+
+}  // namespace tarn::ui
+
+#else
 
 #include <signal.h>
 #include <sys/socket.h>
@@ -39,4 +49,4 @@ void closeOnTerminationSignals(QWidget& window) {
 
 }  // namespace tarn::ui
 
-#endif  // _WIN32
+#endif

@@ -7,7 +7,8 @@ class QWidget;
 
 namespace tarn::ui {
 
-// Installs the handlers; a signal later closes `window` on the window's thread.
+// Installs the handlers; a signal later closes `window` on the window's thread. Does nothing on
+// Windows, which has no such signals for a desktop program.
 void closeOnTerminationSignals(QWidget& window);
 
 }  // namespace tarn::ui

@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "ui/message_box.hpp"
-#include "ui/shell.hpp"
+#include "ui/shell/shell.hpp"
 
 namespace tarn::test {
 

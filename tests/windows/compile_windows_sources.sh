@@ -1,6 +1,8 @@
 #!/usr/bin/env bash
 # Compiles the sources that only a Windows build uses with the MinGW-w64 cross compiler, so that
-# the Windows shell layer and the Windows branches of the core keep building on a Linux machine.
+# the Windows pieces (the platform layer, the window's shell, the Windows side of the signal
+# handling) and the core built on them keep building on a Linux machine. Each file sees the
+# include roots of its own layer, as in the build.
 # Usage: compile_windows_sources.sh CROSS_CXX SOURCE_DIR
 set -euo pipefail
 cxx="$1"
@@ -8,7 +10,25 @@ src="$2/src"
 out="$(mktemp -d)"
 trap 'rm -rf "$out"' EXIT
 
-for f in platform/windows_shell.cpp platform/utf16.cpp core/app_folder.cpp core/data_folder.cpp; do
-    "$cxx" -std=c++20 -Wall -Wextra -Werror -I"$src" -c "$src/$f" -o "$out/$(basename "$f").o"
-    echo "compiled $f"
+# The include roots of the layers, as the build lays them out: <root>/<folder> -> src/<folder>.
+for layer in platform core generation tools ui; do
+    mkdir -p "$out/layers/$layer"
+    ln -s "$src/$layer" "$out/layers/$layer/$layer"
 done
+platform=(-I"$out/layers/platform")
+core=("${platform[@]}" -I"$out/layers/core")
+ui=("${core[@]}" -I"$out/layers/generation" -I"$out/layers/tools" -I"$out/layers/ui")
+
+compile() {
+    local f="$1"
+    shift
+    "$cxx" -std=c++20 -Wall -Wextra -Werror "$@" -c "$src/$f" -o "$out/$(basename "$f").o"
+    echo "compiled $f"
+}
+compile platform/platform_windows.cpp "${platform[@]}"
+compile core/app_folder.cpp "${core[@]}"
+compile core/data_folder.cpp "${core[@]}"
+compile core/path_text.cpp "${core[@]}"
+compile ui/shell/desktop_shell_windows.cpp "${ui[@]}"
+compile ui/shell/utf16.cpp "${ui[@]}"
+compile ui/termination_signals.cpp "${ui[@]}"

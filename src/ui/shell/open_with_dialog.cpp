@@ -1,4 +1,4 @@
-#include "ui/open_with_dialog.hpp"
+#include "ui/shell/open_with_dialog.hpp"
 
 #include <gio/gio.h>
 
@@ -15,10 +15,10 @@ OpenWithDialog::OpenWithDialog(const std::string& path, QWidget* parent)
     : QDialog(parent), list_(new QListWidget(this)) {
     setWindowTitle(QStringLiteral("Open With"));
     auto* layout = new QVBoxLayout(this);
-    layout->addWidget(new QLabel(
-        QStringLiteral("Choose the program you want to use to open the file %1:")
-            .arg(QFileInfo(QString::fromStdString(path)).fileName()),
-        this));
+    layout->addWidget(
+        new QLabel(QStringLiteral("Choose the program you want to use to open the file %1:")
+                       .arg(QFileInfo(QString::fromStdString(path)).fileName()),
+                   this));
     layout->addWidget(list_);
     auto* buttons = new QDialogButtonBox(QDialogButtonBox::Ok | QDialogButtonBox::Cancel, this);
     layout->addWidget(buttons);

@@ -1,4 +1,4 @@
-#include "platform/windows_shell.hpp"
+#include "ui/shell/desktop_shell.hpp"
 
 #ifndef NOMINMAX
 #define NOMINMAX
@@ -9,10 +9,25 @@
 #include <shellapi.h>
 #include <shlobj.h>
 
-#include "platform/utf16.hpp"
+#include "ui/shell/native_window.hpp"
+#include "ui/shell/utf16.hpp"
 
-namespace tarn::platform {
+namespace tarn::ui {
 namespace {
+
+// The shell of Windows. The owner of the Open With dialog is kept as the window's handle.
+class WindowsShell final : public DesktopShell {
+public:
+    void setOwner(QWidget& window) override { owner_ = nativeWindow(window); }
+
+    std::string openInTextEditor(const std::string& path) override;
+    std::string showOpenWith(const std::string& path) override;
+    std::string openUrl(const std::string& url) override;
+    std::string documentsFolder() override;
+
+private:
+    void* owner_ = nullptr;
+};
 
 // The system's own text for an error code (a Win32 error or an HRESULT), without the line end.
 std::string systemMessage(DWORD code) {
@@ -32,8 +47,7 @@ std::string systemMessage(DWORD code) {
     return narrow(text);
 }
 
-}  // namespace
-
+// The command line that starts Notepad with the file: NOTEPAD.EXE "<path>".
 std::wstring notepadCommandLine(const std::wstring& path) {
     return L"NOTEPAD.EXE \"" + path + L"\"";
 }
@@ -92,4 +106,8 @@ std::string WindowsShell::documentsFolder() {
     return narrow(path);
 }
 
-}  // namespace tarn::platform
+}  // namespace
+
+std::unique_ptr<DesktopShell> makeDesktopShell() { return std::make_unique<WindowsShell>(); }
+
+}  // namespace tarn::ui

@@ -1,5 +1,3 @@
-#include "ui/desktop_shell.hpp"
-
 #include <gio/gio.h>
 
 #include <QDesktopServices>
@@ -7,9 +5,26 @@
 #include <QStandardPaths>
 #include <QUrl>
 
-#include "ui/open_with_dialog.hpp"
+#include "ui/shell/desktop_shell.hpp"
+#include "ui/shell/open_with_dialog.hpp"
 
 namespace tarn::ui {
+namespace {
+
+// The shell of a Linux desktop: GIO's application registry for the text editor and the
+// Open With chooser, Qt for the browser and the documents folder.
+class LinuxShell final : public DesktopShell {
+public:
+    void setOwner(QWidget& window) override { dialogParent_ = &window; }
+
+    std::string openInTextEditor(const std::string& path) override;
+    std::string showOpenWith(const std::string& path) override;
+    std::string openUrl(const std::string& url) override;
+    std::string documentsFolder() override;
+
+private:
+    QWidget* dialogParent_ = nullptr;
+};
 
 std::string launchWith(GAppInfo* app, const std::string& path) {
     GFile* file = g_file_new_for_path(path.c_str());
@@ -25,7 +40,7 @@ std::string launchWith(GAppInfo* app, const std::string& path) {
            " could not be started for " + path + ": " + reason;
 }
 
-std::string DesktopShell::openInTextEditor(const std::string& path) {
+std::string LinuxShell::openInTextEditor(const std::string& path) {
     GAppInfo* editor = g_app_info_get_default_for_type("text/plain", FALSE);
     if (!editor)
         return "No text editor is set up on this system to open " + path +
@@ -35,7 +50,7 @@ std::string DesktopShell::openInTextEditor(const std::string& path) {
     return failure;
 }
 
-std::string DesktopShell::showOpenWith(const std::string& path) {
+std::string LinuxShell::showOpenWith(const std::string& path) {
     OpenWithDialog dialog(path, dialogParent_);
     if (dialog.applicationCount() == 0)
         return "No program on this system is registered to open text files such as " + path + ".";
@@ -43,15 +58,19 @@ std::string DesktopShell::showOpenWith(const std::string& path) {
     return launchWith(dialog.chosen(), path);
 }
 
-std::string DesktopShell::openUrl(const std::string& url) {
+std::string LinuxShell::openUrl(const std::string& url) {
     if (QDesktopServices::openUrl(QUrl(QString::fromStdString(url)))) return {};
     return "The web browser could not be started for " + url + ".";
 }
 
-std::string DesktopShell::documentsFolder() {
+std::string LinuxShell::documentsFolder() {
     QString folder = QStandardPaths::writableLocation(QStandardPaths::DocumentsLocation);
     if (folder.isEmpty() || !QDir(folder).exists()) folder = QDir::homePath();
     return QDir::toNativeSeparators(QDir::cleanPath(folder)).toStdString();
 }
+
+}  // namespace
+
+std::unique_ptr<DesktopShell> makeDesktopShell() { return std::make_unique<LinuxShell>(); }
 
 }  // namespace tarn::ui

@@ -4,10 +4,10 @@
 
 #include <string>
 
-namespace tarn::platform {
+namespace tarn::ui {
 
 // Invalid sequences become U+FFFD rather than failing: a path shown in a message is still useful.
 std::wstring widen(const std::string& utf8);
 std::string narrow(const std::wstring& utf16);
 
-}  // namespace tarn::platform
+}  // namespace tarn::ui

@@ -1,11 +1,11 @@
-#include "platform/utf16.hpp"
+#include "ui/shell/utf16.hpp"
 
 #ifndef NOMINMAX
 #define NOMINMAX
 #endif
 #include <windows.h>
 
-namespace tarn::platform {
+namespace tarn::ui {
 
 std::wstring widen(const std::string& utf8) {
     if (utf8.empty()) return {};
@@ -27,4 +27,4 @@ std::string narrow(const std::wstring& utf16) {
     return text;
 }
 
-}  // namespace tarn::platform
+}  // namespace tarn::ui
