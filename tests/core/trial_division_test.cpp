@@ -3,15 +3,18 @@
 #include "core/trial_division.hpp"
 
 #include <gtest/gtest.h>
+#include <pthread.h>
 
-#include "core/miller_rabin.hpp"
-#include "support/plain_sieve.hpp"
-
+#include <atomic>
 #include <chrono>
 #include <cmath>
+#include <ctime>
 #include <random>
 #include <thread>
 #include <vector>
+
+#include "core/miller_rabin.hpp"
+#include "support/plain_sieve.hpp"
 
 using namespace tarn;
 
@@ -112,19 +115,31 @@ TEST(TestPrime2, ClearsAStopRequestMadeBeforeTheCall) {
 }
 
 TEST(TestPrime2, StopsWhenAskedDuringTheWheel) {
-    // A prime near the upper bound keeps the wheel busy for a million turns. The request comes
-    // from another thread a little after the call has begun; on a very busy machine the call
-    // might clear it on entry, so a few attempts are allowed.
-    int code = kPrime;
+    // A prime near the upper bound keeps the wheel busy for a million turns. Another thread
+    // raises the request each time this one has spent two more milliseconds of processor time,
+    // tens of thousands of turns, however either thread is scheduled: so the call meets it deep
+    // in the wheel, not at its first turn. Should the asker not run before a call ends, the
+    // next call is asked.
+    clockid_t caller;
+    ASSERT_EQ(pthread_getcpuclockid(pthread_self(), &caller), 0);
+    const auto worked = [caller] {
+        timespec t{};
+        clock_gettime(caller, &t);
+        return std::chrono::seconds(t.tv_sec) + std::chrono::nanoseconds(t.tv_nsec);
+    };
     StopSignal stop;
-    for (int attempt = 0; attempt < 5 && code != kStopped; ++attempt) {
-        std::thread asker([&stop] {
-            std::this_thread::sleep_for(std::chrono::milliseconds(3));
+    std::atomic<bool> done = false;
+    std::thread asker([&] {
+        for (auto next = worked() + std::chrono::milliseconds(2); !done;) {
+            if (worked() < next) continue;
             stop.request();
-        });
-        code = TestPrime2(922337203685123, stop);
-        asker.join();
-    }
-    EXPECT_EQ(code, kStopped);
+            next = worked() + std::chrono::milliseconds(2);
+        }
+    });
+    int code = kPrime, calls = 0;
+    for (; calls < 20 && code == kPrime; ++calls) code = TestPrime2(922337203685123, stop);
+    done = true;
+    asker.join();
+    EXPECT_EQ(code, kStopped) << "after " << calls << " calls";
     EXPECT_TRUE(stop.requested());
 }

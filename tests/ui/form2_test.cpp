@@ -1,6 +1,5 @@
-// The split window over the recording fakes: what it adds to the split (its form, the folder
-// it writes into, the refusals, the worker and its final message, the stop by "Cancel" or by
-// the title bar) and its screenshot.
+// The split window over the recording fakes: what it adds to the split (the folder it writes into,
+// the refusals, the worker and its final message, the stop by "Cancel" or by the title bar).
 #include "ui/form2.hpp"
 
 #include <gtest/gtest.h>
@@ -63,41 +62,6 @@ struct Form2Test : ::testing::Test {
 };
 
 }  // namespace
-
-TEST_F(Form2Test, IsBuiltAsDesigned) {
-    EXPECT_EQ(form->windowTitle(), "Split Results File");
-    EXPECT_EQ(form->minimumSize(), QSize(408, 221));
-    EXPECT_EQ(form->maximumSize(), QSize(408, 221));
-    const struct {
-        const char *name, *parent, *property, *text;
-        QRect place;
-    } controls[] = {{"Frame1", "Form2", "title", "Save in", {16, 8, 377, 145}},
-                    {"Dir1", "Frame1", nullptr, nullptr, {16, 24, 345, 81}},
-                    {"Label1", "Frame1", nullptr, nullptr, {16, 112, 345, 25}},
-                    {"Text1", "Form2", "text", "1000", {16, 160, 73, 19}},
-                    {"Label2", "Form2", "text", "records in each file", {96, 160, 97, 17}},
-                    {"Command1", "Form2", "text", "Split", {96, 192, 105, 17}},
-                    {"Command2", "Form2", "text", "Close", {224, 192, 97, 17}}};
-    for (const auto& c : controls) {
-        QWidget* w = child(c.name);
-        ASSERT_NE(w, nullptr) << c.name;
-        EXPECT_EQ(w->geometry(), c.place) << c.name;
-        EXPECT_EQ(w->parentWidget()->objectName(), c.parent) << c.name;
-        if (!c.property) continue;
-        EXPECT_EQ(w->property(c.property).toString(), c.text) << c.name;
-    }
-    // Focus starts in the folder list; Tab goes on to the entry and the buttons.
-    QWidget* w = form->focusWidget();
-    for (const char* name : {"Dir1", "Text1", "Command1", "Command2"}) {
-        ASSERT_EQ(w, child(name)) << name;
-        do w = w->nextInFocusChain();
-        while (!(w->focusPolicy() & Qt::TabFocus));
-    }
-    std::filesystem::create_directories(std::string(TARN_SCREENSHOT_DIR));
-    form->show();
-    ASSERT_TRUE(QTest::qWaitForWindowExposed(form.data()));
-    EXPECT_TRUE(form->grab().save(QString::fromLatin1(TARN_SCREENSHOT_DIR) + "/form2.png"));
-}
 
 TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
     test::writeFile(program.path() + "primes.txt", records(2500));
