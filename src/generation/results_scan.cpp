@@ -34,12 +34,16 @@
 
 #include "core/file_messages.hpp"
 #include "core/miller_rabin.hpp"
+#include "generation/results_fast_run.hpp"
+#include "generation/results_line_check.hpp"
 #include "generation/results_scan_keys.hpp"
 
 namespace tarn {
 namespace {
 
+using scan::FastRun;
 using scan::Key;
+using scan::LineCheck;
 
 // The smallest prime p with low < p <= high, or nothing. When the files agree the window is
 // shorter than a prime gap, so only a handful of numbers are ever tested.
@@ -57,157 +61,6 @@ constexpr std::size_t kLongestLine = 64;
 // behind it for the 64 bytes a line-end mask reads and a serial number looked for past a line.
 constexpr std::size_t kFrontRoom = 128;
 constexpr std::size_t kBackRoom = 128;
-constexpr std::int64_t kSeeds[] = {2, 3, 5, 7};
-
-// Digits without a leading zero and without overflow; nothing else.
-bool parseDigits(std::string_view text, std::int64_t& value) {
-    if (text.empty() || text.size() > 18 || text[0] == '0') return false;
-    std::int64_t v = 0;
-    for (const char c : text) {
-        if (c < '0' || c > '9') return false;
-        v = v * 10 + (c - '0');
-    }
-    value = v;
-    return true;
-}
-
-std::string printable(std::string_view record) {
-    std::string text;
-    for (const char c : record.substr(0, 40)) text += (c >= ' ' && c <= '~' && c != '"') ? c : '?';
-    if (record.size() > 40) text += "...";
-    return text;
-}
-
-class LineCheck {
-public:
-    LineCheck(std::int64_t resumePoint, ResultsScan& scan)
-        : resumePoint_(resumePoint), scan_(scan) {}
-
-    // One complete line, terminator included, at file offset `lineStart`. False ends the scan
-    // (damage, or past the candidate).
-    bool line(std::string_view text, std::uint64_t lineStart) {
-        const std::int64_t number = scan_.records + 1;
-        if (text.size() < 2 || text[text.size() - 2] != '\r')
-            return damaged("has a line that does not end with CR LF at line " +
-                           std::to_string(number));
-        const std::string_view record = text.substr(0, text.size() - 2);
-        const std::size_t semicolon = record.find(';');
-        const bool enumerated = semicolon != std::string_view::npos;
-        std::int64_t value = 0;
-        std::int64_t serial = 0;
-        const bool readable = enumerated ? parseDigits(record.substr(0, semicolon), serial) &&
-                                               parseDigits(record.substr(semicolon + 1), value)
-                                         : parseDigits(record, value);
-        if (!readable)
-            return damaged("holds a record that is not a number at line " + std::to_string(number) +
-                           ": \"" + printable(record) + "\"");
-        if (scan_.records > 0 && enumerated != scan_.enumerated)
-            return damaged("mixes plain and enumerated records at line " + std::to_string(number));
-        if (value > resumePoint_) return false;  // beyond the checkpoint: cut from here
-        if (enumerated && serial != number)
-            return damaged("has the serial number " + std::to_string(serial) + " at line " +
-                           std::to_string(number));
-        if (number <= 4 && value != kSeeds[number - 1])
-            return damaged("does not begin with the records 2, 3, 5 and 7 (line " +
-                           std::to_string(number) + " holds " + std::to_string(value) + ")");
-        if (scan_.records > 0 && value <= scan_.lastPrime)
-            return damaged("is not in increasing order at line " + std::to_string(number) + " (" +
-                           std::to_string(value) + " after " + std::to_string(scan_.lastPrime) +
-                           ")");
-        scan_.enumerated = enumerated;
-        scan_.records = number;
-        scan_.lastPrime = value;
-        scan_.keptBytes = lineStart + text.size();
-        return true;
-    }
-
-private:
-    bool damaged(std::string problem) {
-        scan_.outcome = ResultsScan::Outcome::Damaged;
-        scan_.problem = std::move(problem);
-        return false;
-    }
-
-    std::int64_t resumePoint_;
-    ResultsScan& scan_;
-};
-
-// The fast check over a stretch of complete lines; it starts where the scan stands and stops at
-// the first line it does not accept.
-class FastRun {
-public:
-    FastRun(const ResultsScan& scan, Key ceiling)
-        : last_(scan::keyOf(scan.lastPrime)),
-          ceiling_(ceiling),
-          serialKey_(scan::keyOf(scan.records + 1)),
-          serialDigits_(scan::digitCount(scan.records + 1)) {}
-
-    // Where the first line not accepted begins (`end` when all were); [line, end) holds whole
-    // lines but for the last, and the buffer has room around it.
-    template <bool kEnumerated>
-    const char* run(const char* line, const char* end) {
-        // As the keys increase, the last one tells whether any was above the candidate; only then
-        // is the run done again to find the first such line, which happens once in a scan.
-        const FastRun start = *this;
-        const char* const stop = stretch<kEnumerated, false>(line, end);
-        if (!(ceiling_ < last_)) return stop;
-        *this = start;
-        return stretch<kEnumerated, true>(line, end);
-    }
-
-    // Records accepted; the last accepted number.
-    std::int64_t accepted() const { return accepted_; }
-    std::int64_t lastPrime() const { return scan::valueOf(last_); }
-
-private:
-    template <bool kEnumerated, bool kCeiling>
-    const char* stretch(const char* line, const char* end) {
-        for (const char* chunk = line; chunk < end; chunk += 64) {
-            std::uint64_t ends = scan::lineEnds(chunk);
-            if (end - chunk < 64) ends &= (std::uint64_t{1} << (end - chunk)) - 1;
-            for (; ends != 0; ends &= ends - 1) {
-                const char* const lineEnd = chunk + std::countr_zero(ends);
-                if (!accept<kEnumerated, kCeiling>(line, lineEnd)) return line;
-                line = lineEnd + 1;
-            }
-        }
-        return line;
-    }
-
-    // The line [line, lineEnd], lineEnd at its '\n'; with kCeiling, only at or below the candidate.
-    template <bool kEnumerated, bool kCeiling>
-    bool accept(const char* line, const char* lineEnd) {
-        const char* digits = line;
-        if constexpr (kEnumerated) {
-            // The serial number must be the counter's digits and a ';'. Once its bytes equal
-            // the counter's they are digits, so the ';' lies before this line's end.
-            const char* const semicolon = line + serialDigits_;
-            if (*semicolon != ';' ||
-                !(scan::keyBefore(semicolon, scan::keyMask(serialDigits_)) == serialKey_))
-                return false;
-            digits = semicolon + 1;
-        }
-        const char* const cr = lineEnd - 1;
-        const auto length = static_cast<std::size_t>(cr - digits);  // huge when negative
-        if (length - 1 >= 16 || *cr != '\r' || *digits == '0') return false;
-        const Key mask = scan::keyMask(length);
-        const Key key = scan::keyBefore(cr, mask);
-        // One branch for the checks, taken only at a line the plain check has to see.
-        const bool fits =
-            scan::allDigits(key, mask) & (last_ < key) & (!kCeiling || !(ceiling_ < key));
-        if (!fits) return false;
-        last_ = key;
-        ++accepted_;
-        if constexpr (kEnumerated) scan::increment(serialKey_, serialDigits_);
-        return true;
-    }
-
-    Key last_;
-    Key ceiling_;
-    Key serialKey_;
-    int serialDigits_;
-    std::int64_t accepted_ = 0;
-};
 
 class Scanner {
 public:
