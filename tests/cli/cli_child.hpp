@@ -20,6 +20,19 @@ extern char** environ;
 
 namespace tarn::test {
 
+// Waits (20 s at most) until the file at `path` holds more than `bytes` bytes; a file that is
+// not there yet holds none.
+inline void waitForGrowth(const std::string& path, std::uintmax_t bytes) {
+    const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+    const auto size = [&] {
+        std::error_code error;
+        const auto got = std::filesystem::file_size(path, error);
+        return error ? 0 : got;
+    };
+    while (size() <= bytes && std::chrono::steady_clock::now() < until)
+        std::this_thread::sleep_for(std::chrono::milliseconds(2));
+}
+
 class CliChild {
 public:
     // Starts TARN_CLI_PATH with `args`; stdout and stderr go to files in `outputFolder`, and
@@ -53,13 +66,7 @@ public:
 
     // Waits until the child has written something to standard output, so that a signal lands
     // inside its work however slowly the program starts (sanitizer builds on a busy machine).
-    void waitForOutput() const {
-        const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(20);
-        std::error_code error;
-        while ((std::filesystem::file_size(outPath_, error) == 0 || error) &&
-               std::chrono::steady_clock::now() < until)
-            std::this_thread::sleep_for(std::chrono::milliseconds(2));
-    }
+    void waitForOutput() const { waitForGrowth(outPath_, 0); }
 
     // The exit code, or 128 + the signal that ended it; -1 when the program did not start.
     int wait() {

@@ -84,14 +84,7 @@ TEST(JobCommands, TerminationStopsTheJobWithExitCodeThree) {
                                        : std::vector<std::string>{"generate", "100000000000"}),
                        cli.output.path());
         // The signal comes once the job is writing records, however slowly the program starts.
-        const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(20);
-        const auto size = [&] {
-            std::error_code error;  // not there yet: nothing written
-            const auto bytes = std::filesystem::file_size(cli.results(), error);
-            return error ? 0 : bytes;
-        };
-        while (size() <= before + 100'000 && std::chrono::steady_clock::now() < until)
-            std::this_thread::sleep_for(std::chrono::milliseconds(2));
+        waitForGrowth(cli.results(), before + 100'000);
         child.signal(SIGTERM);
         EXPECT_EQ(child.wait(), 3) << child.err();
         EXPECT_EQ(child.err(), (resume ? kResumeNotes : "") + "All calculations were stopped!\n");
