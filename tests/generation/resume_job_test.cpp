@@ -89,11 +89,8 @@ TEST(ResumeJob, FilesThatCannotBeTrustedAreLeftUnchanged) {
         std::string text = good;
         return text.replace(text.find(from), from.size(), to);
     };
-    // Damage to the record that straddles the first block boundary.
-    std::string big = oracleResults(3'000'000, false);
-    const std::size_t start = big.rfind('\n', (1 << 20) - 1) + 1;
-    big[start] = 'x';
-    const auto bigLine = std::to_string(std::count(big.begin(), big.begin() + start, '\n') + 1);
+    // Damage inside the file, at block boundaries included, has the scan's own differential
+    // test; here one case of each kind the resume itself acts on.
     struct Case {
         const char* name;
         char named;  // the file the message names: 'c'heckpoint, 'r'esults, '-' neither; 's'top
@@ -120,22 +117,12 @@ TEST(ResumeJob, FilesThatCannotBeTrustedAreLeftUnchanged) {
          oracleCheckpoint(37, 922337203685477, 1)},
         {"missing results file", 'r', "cannot be read", kNone},
         {"empty results file", 'r', "holds no records", ""},
-        {"letters", 'r', "not a number at line 6", replaced("13\r\n", "1x\r\n")},
-        {"empty record", 'r', "not a number at line 6", replaced("13\r\n", "\r\n13\r\n")},
-        {"leading zero", 'r', "not a number at line 6", replaced("13\r\n", "013\r\n")},
-        {"LF without CR", 'r', "CR LF at line 6", replaced("13\r\n", "13\n")},
         {"decreasing", 'r', "increasing order", replaced("11\r\n13\r\n", "13\r\n11\r\n")},
-        {"repeated", 'r', "increasing order", replaced("13\r\n", "11\r\n13\r\n")},
         {"not starting with 2", 'r', "2, 3, 5 and 7", good.substr(3)},
         {"short of the candidate", 'r', "the prime 37 is missing", replaced("37\r\n", "")},
         {"plain then enumerated", 'r', "mixes", replaced("13\r\n", "6;13\r\n")},
         {"serial skipped", 'r', "serial number 12 at line 11",
          oracleResults(29, true) + "12;31\r\n12;37\r\n"},
-        {"serials from 0", 'r', "not a number", "0;2\r\n", oracleCheckpoint(7, 1000, 1)},
-        {"line longer than a block", 'r', "not a number at line 13",
-         good + std::string(3 << 20, '9') + "\r\n"},
-        {"damage across a block boundary", 'r', "not a number at line " + bigLine, big,
-         oracleCheckpoint(2999977, 3'000'000, 1)},
     };
     for (const Case& c : cases) {
         SCOPED_TRACE(c.name);
