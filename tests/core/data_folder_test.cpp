@@ -53,7 +53,6 @@ TEST(DataFolder, PortableCopyKeepsItsFilesBesideTheProgram) {
     // A folder that happens to be called bin, without share/ beside it, is still portable.
     const std::string bin = dir.path() + "bin/";
     fs::create_directory(bin);
-    EXPECT_FALSE(InstalledLayout(bin));
     EXPECT_EQ(chooseDataFolder(bin, surroundings(true, "/x/data", "/home/u")), bin);
 }
 
@@ -64,7 +63,6 @@ TEST(DataFolder, ReadOnlyOrInstalledCopyUsesTheUsersDataFolder) {
 
     // An installed copy stays out of its prefix even where it may write (root, a user prefix).
     Prefix prefix;
-    EXPECT_TRUE(InstalledLayout(prefix.bin));
     EXPECT_TRUE(InstalledLayout(prefix.root.path() + "bin"));
     EXPECT_EQ(chooseDataFolder(prefix.bin, surroundings(true, "/x/data", "/home/u")),
               "/x/data/tarn/");
@@ -121,8 +119,4 @@ TEST(ReadmePath, ProgramFolderFirstThenInstalledDocumentation) {
 
     test::writeFile(prefix.bin + "README.txt", "portable\n");
     EXPECT_EQ(readmePath(prefix.bin), prefix.bin + "README.txt");
-
-    test::TempFolder portable;
-    test::writeFile(portable.path() + "README.txt", "portable\n");
-    EXPECT_EQ(readmePath(portable.path()), portable.path() + "README.txt");
 }
