@@ -23,6 +23,16 @@ protected:
         press(c().Command1);
     }
     std::string results() { return readFile(dir.path() + "primes.txt"); }
+    // Generate and Resume each show only `message`.
+    void expectBothRefused(const std::string& message) {
+        for (QPushButton* button : {c().Command1, c().Command3}) {
+            messages.shown.clear();
+            press(button);
+            ASSERT_EQ(messages.shown.size(), 1u) << button->text().toStdString();
+            EXPECT_EQ(messages.last().text, message);
+            EXPECT_EQ(messages.last().title, "Info");
+        }
+    }
     std::string reportFor(int primes, int limit) {
         return "Done!!! The results were saved in the file " + dir.path() + "primes.txt. " +
                std::to_string(primes) + " primes found up to number " + std::to_string(limit) +
@@ -158,13 +168,7 @@ TEST_F(JobCommandTest, GenerateAndResumeWaitWhileAnotherJobOrASplitHasTheFiles) 
         const FolderLock other = FolderLock::tryTake(dir.path());
         ASSERT_TRUE(other.held());
         c().Text1->setText("1000");
-        for (QPushButton* button : {c().Command1, c().Command3}) {
-            messages.shown.clear();
-            press(button);
-            ASSERT_EQ(messages.shown.size(), 1u) << button->text().toStdString();
-            EXPECT_EQ(messages.last().text, busy);
-            EXPECT_EQ(messages.last().title, "Info");
-        }
+        expectBothRefused(busy);
         EXPECT_EQ(results(), stopped);
         EXPECT_EQ(readFile(dir.path() + "primes.ini"), checkpoint);
     }
@@ -187,13 +191,7 @@ TEST_F(JobCommandTest, GenerateAndResumeWaitWhileAnotherJobOrASplitHasTheFiles) 
     std::fputs(stopped.c_str(), pipe.get());
     std::fflush(pipe.get());
     ASSERT_TRUE(split->splitRunning());
-    for (QPushButton* button : {c().Command1, c().Command3}) {
-        messages.shown.clear();
-        press(button);
-        ASSERT_EQ(messages.shown.size(), 1u) << button->text().toStdString();
-        EXPECT_EQ(messages.last().text, ui::kJobWhileSplitMessage);
-        EXPECT_EQ(messages.last().title, "Info");
-    }
+    expectBothRefused(ui::kJobWhileSplitMessage);
     EXPECT_EQ(readFile(dir.path() + "primes.ini"), checkpoint);
     pipe.reset();  // the split reads to the end and finishes
     ASSERT_TRUE(splitDone.count() == 1 || splitDone.wait(10000));
