@@ -32,9 +32,9 @@ ChunkProducer::~ChunkProducer() {
     join();
 }
 
-void ChunkProducer::start(int threads, WheelSieve&& first) {
-    threads_.emplace_back([this, sieve = std::move(first)]() mutable { work(std::move(sieve)); });
-    for (int i = 1; i < threads; ++i) threads_.emplace_back([this] { work(std::nullopt); });
+void ChunkProducer::start(int threads, BucketSieve& large) {
+    large_ = &large;
+    for (int i = 0; i < std::max(threads, 1); ++i) threads_.emplace_back([this] { work(); });
 }
 
 void ChunkProducer::join() {
@@ -51,16 +51,24 @@ void ChunkProducer::close(bool failed) {
     published_.notify_all();
 }
 
-void ChunkProducer::work(std::optional<WheelSieve> sieve) {
+void ChunkProducer::work() {
     RecordBuffer* buffer = nullptr;
     try {
+        std::optional<WheelSieve> sieve;
         std::vector<std::uint8_t> sieved(static_cast<std::size_t>(plan_.chunkTurns));
         for (;;) {
             // A buffer first, then a chunk: a claimed chunk never waits for memory.
             buffer = pipeline_.take();
             if (!buffer) return;
-            const Claim chunk = claim();
-            if (chunk.index < 0) break;
+            Claim chunk;
+            {
+                std::lock_guard order(crossing_);
+                chunk = claim();
+                if (chunk.index < 0) break;
+                const std::int64_t turns = chunk.endTurn - chunk.firstTurn;
+                std::memset(sieved.data(), 0, static_cast<std::size_t>(turns));
+                large_->crossOffNext(sieved.data(), turns);
+            }
             if (!sieve)
                 sieve.emplace(chunk.firstTurn, plan_.limit);
             else

@@ -1,7 +1,9 @@
 // The front half of the generation job: a pool of sieving threads. The turns to generate are cut
-// into chunks; each thread claims the next chunk, sieves it segment by segment with a wheel
-// sieve of its own (moved on past the chunks that other threads took), counts its primes, and
-// formats them into a buffer of the write pipeline, which writes the buffers in chunk order.
+// into chunks; each thread claims the next chunk, has the shared bucket sieve cross off the large
+// primes in it (claims and those crossings go one chunk after the other), sieves it segment by
+// segment with the medium primes of a wheel sieve of its own (moved on past the chunks that other
+// threads took), counts its primes, and formats them into a buffer of the write pipeline, which
+// writes the buffers in chunk order.
 // Serial numbers of enumerated records run on across chunks: a chunk learns how many records
 // come before it from the chunk before, which is known as soon as that one is sieved, so the
 // formatting of all chunks goes on at once.
@@ -20,6 +22,8 @@
 #include <vector>
 
 #include "core/stop_signal.hpp"
+#include "core/wheel.hpp"
+#include "generation/bucket_sieve.hpp"
 #include "generation/generation_job.hpp"
 #include "generation/wheel_sieve.hpp"
 #include "generation/write_pipeline.hpp"
@@ -45,9 +49,9 @@ public:
     ChunkProducer(const ChunkProducer&) = delete;
     ChunkProducer& operator=(const ChunkProducer&) = delete;
 
-    // Starts `threads` sieving threads (at least one) and returns at once; the first thread
-    // takes `first`, a sieve that starts at the plan's first turn.
-    void start(int threads, WheelSieve&& first);
+    // Starts `threads` sieving threads (at least one) and returns at once; they share `large`,
+    // made for the plan's chunks, which must outlive them.
+    void start(int threads, BucketSieve& large);
     // Waits until every thread has left.
     void join();
 
@@ -58,7 +62,7 @@ private:
         std::int64_t endTurn = 0;
     };
 
-    void work(std::optional<WheelSieve> sieve);
+    void work();
     Claim claim();
     // Sieves the chunk into `sieved` and returns the turn it ended before (early on a stop).
     std::int64_t sieveChunk(WheelSieve& sieve, const Claim& chunk,
@@ -78,6 +82,8 @@ private:
     const JobHooks& hooks_;
     JobProgress* progress_;
 
+    BucketSieve* large_ = nullptr;
+    std::mutex crossing_;  // held while a chunk is claimed and its large primes crossed off
     std::mutex mutex_;
     std::condition_variable published_;
     std::int64_t nextChunk_ = 0;

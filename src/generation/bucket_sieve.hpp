@@ -1,0 +1,61 @@
+// The large primes of the generation sieve, from kMediumPrimeBound up to the square root of the
+// limit: up to 1.9 million of them, most of which have no multiple at all in a chunk of turns.
+// Each waits in the bucket of the chunk that holds its next multiple, so a chunk costs the
+// multiples that fall in it, not the count of primes. One instance serves every sieving thread:
+// the chunks are crossed off one after the other, in the order the threads claim them, and a
+// prime is activated only once its first multiple comes within reach of the buckets.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <vector>
+
+namespace tarn {
+
+class BucketSieve {
+public:
+    // For the chunks of `chunkTurns` turns from `firstTurn` up to `endTurn` (the last one may be
+    // shorter), for numbers up to `limit`.
+    BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int64_t limit,
+                std::int64_t chunkTurns);
+    ~BucketSieve();
+    BucketSieve(const BucketSieve&) = delete;
+    BucketSieve& operator=(const BucketSieve&) = delete;
+
+    // Marks the multiples of the large primes in the next chunk, whose `turns` bytes are
+    // `bytes` (bit set = composite); other bits are left as they are.
+    void crossOffNext(std::uint8_t* bytes, std::int64_t turns);
+
+    // About the bytes it takes for a limit, for the thread pool's memory budget.
+    static std::uint64_t bytesFor(std::int64_t limit);
+
+private:
+    struct Entry {
+        std::uint32_t prime;
+        std::uint32_t place;  // turn of the next multiple within its chunk << 3 | wheel position
+    };
+    struct Block {
+        Block* next;
+        std::uint32_t count;
+        Entry* entries() { return reinterpret_cast<Entry*>(this + 1); }
+    };
+
+    void activate(std::uint64_t horizon);
+    // Files an entry whose next multiple is `turn` turns after the start of chunk `chunk`.
+    void file(std::uint32_t prime, std::uint64_t chunk, std::uint64_t turn, std::uint32_t wheel);
+    Block* freeBlock();
+
+    const std::int64_t firstTurn_;
+    const std::uint64_t chunkTurns_;
+    const std::uint64_t reciprocal_;  // 2^32 / chunkTurns, for the chunk of a turn
+    const std::uint64_t chunkCount_;
+    std::uint64_t chunk_ = 0;             // the next chunk to cross off
+    std::vector<std::uint32_t> pending_;  // primes not yet in a bucket, ascending
+    std::size_t nextPending_ = 0;
+    std::uint32_t blockEntries_ = 0;
+    std::vector<Block*> buckets_;  // by chunk modulo their count; the head block is filling
+    Block* free_ = nullptr;
+    std::vector<std::unique_ptr<std::byte[]>> storage_;
+};
+
+}  // namespace tarn
