@@ -1,11 +1,12 @@
 // A prime p = 30a + r steps from the multiple p * q to p * (q + s), s the wheel step after q:
 // a * s turns plus a carry that depends only on r and the position of q on the wheel, and the
-// multiple's bit in its turn depends on the same two. So an entry needs only the prime, the turn
-// of its next multiple and the wheel position.
+// multiple's bit in its turn depends on the same two. So an entry needs only a, r's position, the
+// turn of its next multiple and the wheel position.
 #include "generation/bucket_sieve.hpp"
 
 #include <algorithm>
 #include <array>
+#include <bit>
 #include <cmath>
 #include <utility>
 
@@ -42,25 +43,38 @@ std::uint64_t longestStep(std::uint64_t p) { return (6 * p + kSievePeriod - 1) /
 }  // namespace
 
 BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int64_t limit,
-                         std::int64_t chunkTurns)
+                         std::int64_t chunkTurns, int groups)
     : firstTurn_(firstTurn),
       chunkTurns_(static_cast<std::uint64_t>(chunkTurns)),
       reciprocal_((std::uint64_t{1} << 32) / chunkTurns_),
       chunkCount_(static_cast<std::uint64_t>(std::max<std::int64_t>(endTurn - firstTurn, 0) +
                                              chunkTurns - 1) /
                   chunkTurns_) {
+    groups_.resize(static_cast<std::size_t>(std::max(groups, 1)));
     const std::uint64_t root = limit > 0 ? wholeSqrt(static_cast<std::uint64_t>(limit)) : 0;
     if (root < kMediumPrimeBound || chunkCount_ == 0) return;
-    pending_ = sievingPrimes(kMediumPrimeBound, static_cast<std::uint32_t>(root));
-    if (pending_.empty()) return;
+    std::vector<std::uint32_t> primes =
+        sievingPrimes(kMediumPrimeBound, static_cast<std::uint32_t>(root));
+    if (primes.empty()) return;
     // A bucket for every chunk a next multiple can lie in, and the chunk being crossed off.
-    const std::uint64_t reach = (chunkTurns_ + longestStep(pending_.back())) / chunkTurns_ + 1;
-    buckets_.assign(static_cast<std::size_t>(std::min(reach, chunkCount_) + 1), nullptr);
+    const std::uint64_t reach = (chunkTurns_ + longestStep(primes.back())) / chunkTurns_ + 1;
+    const std::size_t buckets = std::bit_ceil(std::min(reach, chunkCount_) + 1);
+    bucketMask_ = buckets - 1;
     // Blocks large enough to fill in long runs, small enough that the partly filled ones stay
     // a small part of the whole.
-    const std::size_t perBucket = pending_.size() / buckets_.size();
+    const std::size_t perBucket = primes.size() / buckets / groups_.size();
     blockEntries_ = static_cast<std::uint32_t>(std::clamp<std::size_t>(perBucket / 4, 16, 2048));
-    activate(buckets_.size() - 1);
+    // Dealt in turn, so that every group gets its share of each size.
+    if (groups_.size() == 1) {
+        groups_[0].pending = std::move(primes);
+    } else {
+        for (Group& group : groups_) group.pending.reserve(primes.size() / groups_.size() + 1);
+        for (std::size_t i = 0; i < primes.size(); ++i)
+            groups_[i % groups_.size()].pending.push_back(primes[i]);
+        primes = {};
+    }
+    // Each group fills its buckets as it crosses off its first chunk, on a sieving thread.
+    for (Group& group : groups_) group.buckets.assign(buckets, nullptr);
 }
 
 BucketSieve::~BucketSieve() = default;
@@ -71,24 +85,24 @@ std::uint64_t BucketSieve::bytesFor(std::int64_t limit) {
     return static_cast<std::uint64_t>(12 * 1.26 * root / std::log(root));
 }
 
-BucketSieve::Block* BucketSieve::freeBlock() {
-    if (!free_) {
-        storage_.push_back(
+BucketSieve::Block* BucketSieve::freeBlock(Group& group) const {
+    if (!group.free) {
+        group.storage.push_back(
             std::make_unique<std::byte[]>(sizeof(Block) + blockEntries_ * sizeof(Entry)));
-        auto* block = reinterpret_cast<Block*>(storage_.back().get());
+        auto* block = reinterpret_cast<Block*>(group.storage.back().get());
         block->next = nullptr;
-        free_ = block;
+        group.free = block;
     }
-    Block* block = free_;
-    free_ = block->next;
+    Block* block = group.free;
+    group.free = block->next;
     block->next = nullptr;
     block->count = 0;
     return block;
 }
 
-void BucketSieve::file(std::uint32_t prime, std::uint64_t chunk, std::uint64_t turn,
-                       std::uint32_t wheel) {
-    // The chunk of the turn (below 2^32) by a multiplication, one short at most.
+inline void BucketSieve::file(Group& group, std::uint32_t prime, std::uint64_t chunk,
+                              std::uint64_t turn, std::uint32_t wheel) const {
+    // The chunk of the turn by a multiplication, one short at most.
     std::uint64_t ahead = (turn * reciprocal_) >> 32;
     turn -= ahead * chunkTurns_;
     if (turn >= chunkTurns_) {
@@ -97,19 +111,19 @@ void BucketSieve::file(std::uint32_t prime, std::uint64_t chunk, std::uint64_t t
     }
     chunk += ahead;
     if (chunk >= chunkCount_) return;  // beyond the job: this prime is done
-    Block*& head = buckets_[chunk % buckets_.size()];
-    if (!head || head->count == blockEntries_) {
-        Block* block = freeBlock();
+    Block*& head = group.buckets[chunk & bucketMask_];
+    if (!head || head->count == blockEntries_) [[unlikely]] {
+        Block* block = freeBlock(group);
         block->next = head;
         head = block;
     }
     head->entries()[head->count++] = Entry{prime, static_cast<std::uint32_t>(turn << 3) | wheel};
 }
 
-void BucketSieve::activate(std::uint64_t horizon) {
+void BucketSieve::activate(Group& group, std::uint64_t horizon) const {
     const auto start = static_cast<std::uint64_t>(turnStart(firstTurn_));
-    while (nextPending_ < pending_.size()) {
-        const std::uint32_t p = pending_[nextPending_];
+    while (group.nextPending < group.pending.size()) {
+        const std::uint32_t p = group.pending[group.nextPending];
         std::uint32_t wheel = 0;
         const std::uint64_t m = firstMultiple(p, start, wheel);
         const std::uint64_t turn =
@@ -118,33 +132,40 @@ void BucketSieve::activate(std::uint64_t horizon) {
         // Primes whose squares lie past the start begin there, so the later ones further out.
         if (std::uint64_t{p} * p >= start && chunk > horizon) break;
         if (std::uint64_t{p} * p >= start && chunk >= chunkCount_) {
-            nextPending_ = pending_.size();
+            group.nextPending = group.pending.size();
             break;
         }
-        ++nextPending_;
-        file(p, chunk, turn - chunk * chunkTurns_, wheel);
+        ++group.nextPending;
+        const auto packed =
+            static_cast<std::uint32_t>(p / kSievePeriod << 3) | kCrossing.residue[p % kSievePeriod];
+        file(group, packed, chunk, turn - chunk * chunkTurns_, wheel);
     }
-    if (nextPending_ == pending_.size()) {
-        pending_.clear();
-        pending_.shrink_to_fit();
-        nextPending_ = 0;
+    if (group.nextPending == group.pending.size()) {
+        group.pending = {};
+        group.nextPending = 0;
     }
 }
 
-void BucketSieve::crossOffNext(std::uint8_t* bytes, std::int64_t turns) {
-    const std::uint64_t chunk = chunk_++;
-    if (buckets_.empty()) return;
-    if (!pending_.empty()) activate(chunk + buckets_.size() - 1);
-    Block* block = std::exchange(buckets_[chunk % buckets_.size()], nullptr);
+void BucketSieve::crossOffNext(int index, std::uint8_t* bytes, std::int64_t turns) {
+    Group& group = groups_[static_cast<std::size_t>(index)];
+    const std::uint64_t chunk = group.chunk++;
+    if (group.buckets.empty()) return;
+    if (!group.pending.empty()) activate(group, chunk + bucketMask_);
+    Block* block = std::exchange(group.buckets[chunk & bucketMask_], nullptr);
+    // Held in locals: the byte stores below could alias any member.
     const auto length = static_cast<std::uint64_t>(turns);
+    const std::uint64_t chunkTurns = chunkTurns_, reciprocal = reciprocal_, mask = bucketMask_;
+    const std::uint64_t chunksLeft = chunkCount_ - chunk;
+    const std::uint32_t blockEntries = blockEntries_;
+    Block** const buckets = group.buckets.data();
     while (block) {
         const Entry* entry = block->entries();
         const Entry* const end = entry + block->count;
         for (; entry != end; ++entry) {
-            const std::uint32_t p = entry->prime;
-            const std::uint64_t a = p / kSievePeriod;
-            const auto& bit = kCrossing.bit[kCrossing.residue[p % kSievePeriod]];
-            const auto& carry = kCrossing.carry[kCrossing.residue[p % kSievePeriod]];
+            const std::uint32_t prime = entry->prime;
+            const std::uint64_t a = prime >> 3;
+            const auto& bit = kCrossing.bit[prime & 7];
+            const auto& carry = kCrossing.carry[prime & 7];
             std::uint64_t turn = entry->place >> 3;
             std::uint32_t wheel = entry->place & 7;
             while (turn < length) {
@@ -152,11 +173,26 @@ void BucketSieve::crossOffNext(std::uint8_t* bytes, std::int64_t turns) {
                 turn += a * kWheelSteps[wheel] + carry[wheel];
                 wheel = (wheel + 1) & 7;
             }
-            file(p, chunk, turn, wheel);
+            // The chunk of the next multiple by a multiplication, one short at most.
+            std::uint64_t ahead = (turn * reciprocal) >> 32;
+            turn -= ahead * chunkTurns;
+            if (turn >= chunkTurns) {
+                turn -= chunkTurns;
+                ++ahead;
+            }
+            if (ahead >= chunksLeft) continue;  // beyond the job: this prime is done
+            Block*& head = buckets[(chunk + ahead) & mask];
+            if (!head || head->count == blockEntries) [[unlikely]] {
+                Block* const fresh = freeBlock(group);
+                fresh->next = head;
+                head = fresh;
+            }
+            head->entries()[head->count++] =
+                Entry{prime, static_cast<std::uint32_t>(turn << 3) | wheel};
         }
         Block* const next = block->next;
-        block->next = free_;
-        free_ = block;
+        block->next = group.free;
+        group.free = block;
         block = next;
     }
 }

@@ -34,6 +34,7 @@ ChunkProducer::~ChunkProducer() {
 
 void ChunkProducer::start(int threads, BucketSieve& large) {
     large_ = &large;
+    groupChunk_.assign(static_cast<std::size_t>(large.groups()), 0);
     for (int i = 0; i < std::max(threads, 1); ++i) threads_.emplace_back([this] { work(); });
 }
 
@@ -60,15 +61,14 @@ void ChunkProducer::work() {
             // A buffer first, then a chunk: a claimed chunk never waits for memory.
             buffer = pipeline_.take();
             if (!buffer) return;
-            Claim chunk;
-            {
-                std::lock_guard order(crossing_);
-                chunk = claim();
-                if (chunk.index < 0) break;
-                const std::int64_t turns = chunk.endTurn - chunk.firstTurn;
-                std::memset(sieved.data(), 0, static_cast<std::size_t>(turns));
-                large_->crossOffNext(sieved.data(), turns);
-            }
+            const Claim chunk = claim();
+            if (chunk.index < 0) break;
+            const std::int64_t turns = chunk.endTurn - chunk.firstTurn;
+            std::memset(sieved.data(), 0, static_cast<std::size_t>(turns));
+            bool crossed = true;
+            for (int g = 0; crossed && g < large_->groups(); ++g)
+                crossed = crossOff(g, chunk.index, sieved.data(), turns);
+            if (!crossed) break;
             if (!sieve)
                 sieve.emplace(chunk.firstTurn, plan_.limit);
             else
@@ -89,6 +89,23 @@ void ChunkProducer::work() {
         close(true);
     }
     if (buffer) pipeline_.release(buffer);
+}
+
+bool ChunkProducer::crossOff(int group, std::int64_t index, std::uint8_t* bytes,
+                             std::int64_t turns) {
+    const auto g = static_cast<std::size_t>(group);
+    {
+        std::unique_lock lock(mutex_);
+        published_.wait(lock, [&] { return failed_ || groupChunk_[g] == index; });
+        if (failed_) return false;
+    }
+    large_->crossOffNext(group, bytes, turns);
+    {
+        std::lock_guard lock(mutex_);
+        ++groupChunk_[g];
+    }
+    published_.notify_all();
+    return true;
 }
 
 ChunkProducer::Claim ChunkProducer::claim() {

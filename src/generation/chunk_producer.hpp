@@ -1,6 +1,7 @@
 // The front half of the generation job: a pool of sieving threads. The turns to generate are cut
-// into chunks; each thread claims the next chunk, has the shared bucket sieve cross off the large
-// primes in it (claims and those crossings go one chunk after the other), sieves it segment by
+// into chunks; each thread claims the next chunk, has each group of the shared bucket sieve cross
+// off its large primes in it (every group takes the chunks in claim order, so while one thread
+// works with one group another works with the next), sieves it segment by
 // segment with the medium primes of a wheel sieve of its own (moved on past the chunks that other
 // threads took), counts its primes, and formats them into a buffer of the write pipeline, which
 // writes the buffers in chunk order.
@@ -82,10 +83,14 @@ private:
     const JobHooks& hooks_;
     JobProgress* progress_;
 
+    // Waits for the group's turn on the chunk, crosses off, and hands the group on; false when
+    // a failure ended the job first.
+    bool crossOff(int group, std::int64_t index, std::uint8_t* bytes, std::int64_t turns);
+
     BucketSieve* large_ = nullptr;
-    std::mutex crossing_;  // held while a chunk is claimed and its large primes crossed off
     std::mutex mutex_;
-    std::condition_variable published_;
+    std::condition_variable published_;     // a chunk's count, a group's next chunk, or a failure
+    std::vector<std::int64_t> groupChunk_;  // the next chunk of each group of large primes
     std::int64_t nextChunk_ = 0;
     bool closed_ = false;  // a stop or a failure: no further chunk is claimed
     bool failed_ = false;  // a thread failed: nobody waits for a chunk count any more

@@ -133,11 +133,12 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
     plan.chunkTurns =
         hooks.turnsPerChunk > 0 ? hooks.turnsPerChunk : plan.segmentTurns * kSegmentsPerChunk;
 
+    const int threads = sievingThreads(spec.threads, spec.limit, plan.chunkTurns);
     // The large primes' buckets are built before any file is touched: at the top of the range
     // they are the job's largest piece of memory.
     std::optional<BucketSieve> large;
     try {
-        large.emplace(first, end, spec.limit, plan.chunkTurns);
+        large.emplace(first, end, spec.limit, plan.chunkTurns, threads);
     } catch (const std::bad_alloc&) {
         result.error = "There is not enough memory to generate the primes up to " +
                        std::to_string(spec.limit) + ".";
@@ -162,8 +163,6 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
         progress->candidate.store(firstTurnStart, std::memory_order_relaxed);
         progress->primeCount.store(start.primeCount, std::memory_order_relaxed);
     }
-
-    const int threads = sievingThreads(spec.threads, spec.limit, plan.chunkTurns);
 
     FileMark written, durable;
     {

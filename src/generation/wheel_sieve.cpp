@@ -8,11 +8,36 @@
 #include "generation/sieving_primes.hpp"
 
 namespace tarn {
+namespace {
 
-WheelSieve::WheelSieve(std::int64_t firstTurn, std::int64_t limit) : turn_(firstTurn) {
+constexpr std::array<std::uint32_t, 5> kPatternPrimes{7, 11, 13, 17, 19};
+constexpr std::size_t kPatternTurns = 7 * 11 * 13 * 17 * 19;
+
+// The marks of the pattern primes' multiples, turn by turn from turn 0, which holds 11, 13, 17
+// and 19 themselves: those four are marked too, and unmarked where turn 0 is sieved.
+const std::vector<std::uint8_t>& pattern() {
+    static const std::vector<std::uint8_t> marks = [] {
+        std::vector<std::uint8_t> bytes(kPatternTurns, 0);
+        for (std::size_t t = 0; t < kPatternTurns; ++t)
+            for (std::uint32_t b = 0; b < 8; ++b)
+                for (const std::uint32_t p : kPatternPrimes)
+                    if ((kSievePeriod * t + kSieveFirst + kTurnOffsets[b]) % p == 0)
+                        bytes[t] |= static_cast<std::uint8_t>(1u << b);
+        return bytes;
+    }();
+    return marks;
+}
+
+constexpr std::uint8_t kPatternPrimesInTurn0 = 0b1111;  // 11, 13, 17, 19
+
+}  // namespace
+
+WheelSieve::WheelSieve(std::int64_t firstTurn, std::int64_t limit)
+    : turn_(firstTurn), patternAt_(static_cast<std::size_t>(firstTurn) % kPatternTurns) {
     const std::uint64_t root = limit > 0 ? wholeSqrt(static_cast<std::uint64_t>(limit)) : 0;
     const std::vector<std::uint32_t> primes = sievingPrimes(
-        7, static_cast<std::uint32_t>(std::min<std::uint64_t>(root, kMediumPrimeBound - 1)));
+        kPatternPrimes.back() + 1,
+        static_cast<std::uint32_t>(std::min<std::uint64_t>(root, kMediumPrimeBound - 1)));
     const auto start = static_cast<std::uint64_t>(turnStart(firstTurn));
     medium_.reserve(primes.size());
     for (const std::uint32_t p : primes) {
@@ -48,9 +73,20 @@ void WheelSieve::skipTo(std::int64_t turn) {
         }
     }
     turn_ = turn;
+    patternAt_ = static_cast<std::size_t>(turn) % kPatternTurns;
 }
 
 void WheelSieve::sieveNext(std::uint8_t* bytes, std::size_t turns) {
+    const std::uint8_t* const marks = pattern().data();
+    for (std::size_t done = 0; done < turns;) {
+        const std::size_t run = std::min(turns - done, kPatternTurns - patternAt_);
+        std::uint8_t* const out = bytes + done;
+        const std::uint8_t* const in = marks + patternAt_;
+        for (std::size_t i = 0; i < run; ++i) out[i] |= in[i];
+        done += run;
+        patternAt_ = (patternAt_ + run) % kPatternTurns;
+    }
+    if (turn_ == 0 && turns > 0) bytes[0] &= static_cast<std::uint8_t>(~kPatternPrimesInTurn0);
     const std::uint64_t length = turns;
     for (Medium& s : medium_) {
         const std::uint64_t p = s.p;
