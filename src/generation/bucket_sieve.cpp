@@ -50,12 +50,12 @@ BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int6
       chunkCount_(static_cast<std::uint64_t>(std::max<std::int64_t>(endTurn - firstTurn, 0) +
                                              chunkTurns - 1) /
                   chunkTurns_) {
-    groups_.resize(static_cast<std::size_t>(std::max(groups, 1)));
     const std::uint64_t root = limit > 0 ? wholeSqrt(static_cast<std::uint64_t>(limit)) : 0;
     if (root < kMediumPrimeBound || chunkCount_ == 0) return;
     std::vector<std::uint32_t> primes =
         sievingPrimes(kMediumPrimeBound, static_cast<std::uint32_t>(root));
     if (primes.empty()) return;
+    groups_.resize(static_cast<std::size_t>(std::max(groups, 1)));
     // A bucket for every chunk a next multiple can lie in, and the chunk being crossed off.
     const std::uint64_t reach = (chunkTurns_ + longestStep(primes.back())) / chunkTurns_ + 1;
     const std::size_t buckets = std::bit_ceil(std::min(reach, chunkCount_) + 1);
@@ -149,7 +149,6 @@ void BucketSieve::activate(Group& group, std::uint64_t horizon) const {
 void BucketSieve::crossOffNext(int index, std::uint8_t* bytes, std::int64_t turns) {
     Group& group = groups_[static_cast<std::size_t>(index)];
     const std::uint64_t chunk = group.chunk++;
-    if (group.buckets.empty()) return;
     if (!group.pending.empty()) activate(group, chunk + bucketMask_);
     Block* block = std::exchange(group.buckets[chunk & bucketMask_], nullptr);
     // Held in locals: the byte stores below could alias any member.

@@ -23,6 +23,7 @@ public:
     BucketSieve(const BucketSieve&) = delete;
     BucketSieve& operator=(const BucketSieve&) = delete;
 
+    // None when no prime reaches kMediumPrimeBound.
     int groups() const { return static_cast<int>(groups_.size()); }
 
     // Marks the multiples of the primes of `group` in that group's next chunk, whose `turns`
