@@ -18,11 +18,14 @@ constexpr std::size_t kPatternTurns = 7 * 11 * 13 * 17 * 19;
 const std::vector<std::uint8_t>& pattern() {
     static const std::vector<std::uint8_t> marks = [] {
         std::vector<std::uint8_t> bytes(kPatternTurns, 0);
-        for (std::size_t t = 0; t < kPatternTurns; ++t)
-            for (std::uint32_t b = 0; b < 8; ++b)
-                for (const std::uint32_t p : kPatternPrimes)
-                    if ((kSievePeriod * t + kSieveFirst + kTurnOffsets[b]) % p == 0)
-                        bytes[t] |= static_cast<std::uint8_t>(1u << b);
+        for (const std::uint32_t p : kPatternPrimes) {
+            for (std::uint32_t b = 0; b < 8; ++b) {
+                // Bit b of turn t is a multiple of p for every p-th turn from the first one.
+                std::size_t t = 0;
+                while ((kSievePeriod * t + kSieveFirst + kTurnOffsets[b]) % p != 0) ++t;
+                for (; t < kPatternTurns; t += p) bytes[t] |= static_cast<std::uint8_t>(1u << b);
+            }
+        }
         return bytes;
     }();
     return marks;
