@@ -74,7 +74,7 @@ BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int6
         primes = {};
     }
     // Each group fills its buckets as it crosses off its first chunk, on a sieving thread.
-    for (Group& group : groups_) group.buckets.assign(buckets, nullptr);
+    for (Group& group : groups_) group.buckets.assign(2 * buckets, nullptr);
 }
 
 BucketSieve::~BucketSieve() = default;
@@ -111,7 +111,7 @@ inline void BucketSieve::file(Group& group, std::uint32_t prime, std::uint64_t c
     }
     chunk += ahead;
     if (chunk >= chunkCount_) return;  // beyond the job: this prime is done
-    Block*& head = group.buckets[chunk & bucketMask_];
+    Block*& head = group.buckets[(chunk & bucketMask_) + (once(prime) ? bucketMask_ + 1 : 0)];
     if (!head || head->count == blockEntries_) [[unlikely]] {
         Block* block = freeBlock(group);
         block->next = head;
@@ -150,13 +150,19 @@ void BucketSieve::crossOffNext(int index, std::uint8_t* bytes, std::int64_t turn
     Group& group = groups_[static_cast<std::size_t>(index)];
     const std::uint64_t chunk = group.chunk++;
     if (!group.pending.empty()) activate(group, chunk + bucketMask_);
-    Block* block = std::exchange(group.buckets[chunk & bucketMask_], nullptr);
+    crossOff<false>(group, chunk, bytes, static_cast<std::uint64_t>(turns));
+    crossOff<true>(group, chunk, bytes, static_cast<std::uint64_t>(turns));
+}
+
+template <bool kOnce>
+void BucketSieve::crossOff(Group& group, std::uint64_t chunk, std::uint8_t* bytes,
+                           std::uint64_t length) {
     // Held in locals: the byte stores below could alias any member.
-    const auto length = static_cast<std::uint64_t>(turns);
     const std::uint64_t chunkTurns = chunkTurns_, reciprocal = reciprocal_, mask = bucketMask_;
     const std::uint64_t chunksLeft = chunkCount_ - chunk;
     const std::uint32_t blockEntries = blockEntries_;
-    Block** const buckets = group.buckets.data();
+    Block** const buckets = group.buckets.data() + (kOnce ? mask + 1 : 0);
+    Block* block = std::exchange(buckets[chunk & mask], nullptr);
     while (block) {
         const Entry* entry = block->entries();
         const Entry* const end = entry + block->count;
@@ -167,11 +173,13 @@ void BucketSieve::crossOffNext(int index, std::uint8_t* bytes, std::int64_t turn
             const auto& carry = kCrossing.carry[prime & 7];
             std::uint64_t turn = entry->place >> 3;
             std::uint32_t wheel = entry->place & 7;
-            while (turn < length) {
+            // Filed here, the next multiple lies in this chunk; primes whose shortest step
+            // spans a chunk have no other.
+            do {
                 bytes[turn] |= bit[wheel];
                 turn += a * kWheelSteps[wheel] + carry[wheel];
                 wheel = (wheel + 1) & 7;
-            }
+            } while (!kOnce && turn < length);
             // The chunk of the next multiple by a multiplication, one short at most.
             std::uint64_t ahead = (turn * reciprocal) >> 32;
             turn -= ahead * chunkTurns;

@@ -48,12 +48,18 @@ private:
         std::uint64_t chunk = 0;             // the next chunk to cross off
         std::vector<std::uint32_t> pending;  // primes not yet in a bucket, ascending
         std::size_t nextPending = 0;
-        std::vector<Block*> buckets;  // by chunk modulo their count; the head block is filling
+        // By chunk modulo their count, then the same for the primes that hit a chunk once at
+        // most; the head block is filling.
+        std::vector<Block*> buckets;
         Block* free = nullptr;
         std::vector<std::unique_ptr<std::byte[]>> storage;
     };
 
+    // A prime whose shortest step (2p / 30 turns) spans a chunk.
+    bool once(std::uint32_t prime) const { return 2 * std::uint64_t{prime >> 3} >= chunkTurns_; }
     void activate(Group& group, std::uint64_t horizon) const;
+    template <bool kOnce>
+    void crossOff(Group& group, std::uint64_t chunk, std::uint8_t* bytes, std::uint64_t length);
     // Files an entry whose next multiple is `turn` (below 2^32) turns after the start of
     // chunk `chunk`.
     void file(Group& group, std::uint32_t prime, std::uint64_t chunk, std::uint64_t turn,
