@@ -40,6 +40,37 @@ constexpr Crossing kCrossing = [] {
 // The longest step between two multiples of p on the wheel, in turns, rounded up.
 std::uint64_t longestStep(std::uint64_t p) { return (6 * p + kSievePeriod - 1) / kSievePeriod + 1; }
 
+// The primes from kMediumPrimeBound up to `root` (at most 3.1 * 10^7), dealt in turn into
+// `groups` lists, so that every group gets its share of each size; by the medium primes' own
+// sieve, which covers every factor up to the square root of `root`.
+std::vector<std::vector<std::uint32_t>> largePrimes(std::uint64_t root, std::size_t groups) {
+    std::vector<std::vector<std::uint32_t>> dealt(groups);
+    const auto count = static_cast<std::size_t>(1.3 * root / std::log(root));
+    for (auto& primes : dealt) primes.reserve(count / groups + 1);
+    constexpr std::int64_t kSegment = 1 << 15;
+    const auto first = static_cast<std::int64_t>((kMediumPrimeBound - kSieveFirst) / kSievePeriod);
+    const auto end = static_cast<std::int64_t>((root - kSieveFirst) / kSievePeriod) + 1;
+    WheelSieve sieve(first, static_cast<std::int64_t>(root));
+    std::vector<std::uint8_t> segment(kSegment);
+    std::size_t found = 0;
+    for (std::int64_t turn = first; turn < end; turn += kSegment) {
+        const auto turns = static_cast<std::size_t>(std::min(kSegment, end - turn));
+        std::fill_n(segment.begin(), turns, 0);
+        sieve.sieveNext(segment.data(), turns);
+        for (std::size_t i = 0; i < turns; ++i) {
+            const auto start =
+                static_cast<std::uint64_t>(turnStart(turn + static_cast<std::int64_t>(i)));
+            for (unsigned bits = static_cast<std::uint8_t>(~segment[i]); bits != 0;
+                 bits &= bits - 1) {
+                const std::uint64_t n = start + kTurnOffsets[std::countr_zero(bits)];
+                if (n >= kMediumPrimeBound && n <= root)
+                    dealt[found++ % groups].push_back(static_cast<std::uint32_t>(n));
+            }
+        }
+    }
+    return dealt;
+}
+
 }  // namespace
 
 BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int64_t limit,
@@ -52,27 +83,25 @@ BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int6
                   chunkTurns_) {
     const std::uint64_t root = limit > 0 ? wholeSqrt(static_cast<std::uint64_t>(limit)) : 0;
     if (root < kMediumPrimeBound || chunkCount_ == 0) return;
-    std::vector<std::uint32_t> primes =
-        sievingPrimes(kMediumPrimeBound, static_cast<std::uint32_t>(root));
-    if (primes.empty()) return;
-    groups_.resize(static_cast<std::size_t>(std::max(groups, 1)));
+    std::vector<std::vector<std::uint32_t>> dealt =
+        largePrimes(root, static_cast<std::size_t>(std::max(groups, 1)));
+    if (dealt[0].empty()) return;
+    groups_.resize(dealt.size());
+    std::uint32_t largest = 0;
+    std::size_t total = 0;
+    for (std::size_t g = 0; g < dealt.size(); ++g) {
+        total += dealt[g].size();
+        if (!dealt[g].empty()) largest = std::max(largest, dealt[g].back());
+        groups_[g].pending = std::move(dealt[g]);
+    }
     // A bucket for every chunk a next multiple can lie in, and the chunk being crossed off.
-    const std::uint64_t reach = (chunkTurns_ + longestStep(primes.back())) / chunkTurns_ + 1;
+    const std::uint64_t reach = (chunkTurns_ + longestStep(largest)) / chunkTurns_ + 1;
     const std::size_t buckets = std::bit_ceil(std::min(reach, chunkCount_) + 1);
     bucketMask_ = buckets - 1;
     // Blocks large enough to fill in long runs, small enough that the partly filled ones stay
     // a small part of the whole.
-    const std::size_t perBucket = primes.size() / buckets / groups_.size();
+    const std::size_t perBucket = total / buckets / groups_.size();
     blockEntries_ = static_cast<std::uint32_t>(std::clamp<std::size_t>(perBucket / 4, 16, 2048));
-    // Dealt in turn, so that every group gets its share of each size.
-    if (groups_.size() == 1) {
-        groups_[0].pending = std::move(primes);
-    } else {
-        for (Group& group : groups_) group.pending.reserve(primes.size() / groups_.size() + 1);
-        for (std::size_t i = 0; i < primes.size(); ++i)
-            groups_[i % groups_.size()].pending.push_back(primes[i]);
-        primes = {};
-    }
     // Each group fills its buckets as it crosses off its first chunk, on a sieving thread.
     for (Group& group : groups_) group.buckets.assign(2 * buckets, nullptr);
 }

@@ -29,7 +29,8 @@ inline constexpr std::array<std::uint8_t, kSievePeriod> kBitOfOffset = [] {
 // The whole part of the square root, exact for every 64-bit value.
 std::uint64_t wholeSqrt(std::uint64_t n);
 
-// The primes p with from <= p <= bound and p >= 7, ascending.
+// The primes p with from <= p <= bound and p >= 7, ascending, by a plain sieve of odd numbers
+// (for the medium primes: kMediumPrimeBound is small).
 std::vector<std::uint32_t> sievingPrimes(std::uint32_t from, std::uint32_t bound);
 
 // The first multiple p * q to cross off at or above `start`: q prime to 30 and q >= p (smaller
