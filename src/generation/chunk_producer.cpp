@@ -1,6 +1,7 @@
 #include "generation/chunk_producer.hpp"
 
 #include <algorithm>
+#include <array>
 #include <bit>
 #include <cstring>
 #include <optional>
@@ -11,6 +12,14 @@
 
 namespace tarn {
 namespace {
+
+// Bit i of eight turns read as one little-endian word, counted from the first turn's start.
+constexpr std::array<std::uint32_t, 64> kWordOffsets = [] {
+    std::array<std::uint32_t, 64> offsets{};
+    for (std::uint32_t i = 0; i < 64; ++i)
+        offsets[i] = static_cast<std::uint32_t>(kWheelPeriod) * (i / 8) + kTurnOffsets[i % 8];
+    return offsets;
+}();
 
 int decimalDigits(std::uint64_t n) {
     int digits = 1;
@@ -191,13 +200,23 @@ void ChunkProducer::format(const Claim& chunk, std::int64_t reached,
     char* out = data;
     RecordFormatter formatter(static_cast<std::uint64_t>(turnStart(chunk.firstTurn)),
                               static_cast<std::uint64_t>(before), plan_.enumerated);
-    for (std::int64_t t = chunk.firstTurn; t < reached; ++t) {
-        unsigned primes = static_cast<std::uint8_t>(~sieved[t - chunk.firstTurn]);
-        const auto start = static_cast<std::uint64_t>(turnStart(t));
-        while (primes != 0) {
-            out = formatter.put(out, start + kTurnOffsets[std::countr_zero(primes)]);
-            primes &= primes - 1;
+    const std::int64_t turns = reached - chunk.firstTurn;
+    std::int64_t t = 0;
+    if constexpr (std::endian::native == std::endian::little) {
+        // Eight turns a word: one hard-to-predict loop end per eight turns, not per turn.
+        for (; t + 8 <= turns; t += 8) {
+            std::uint64_t word;
+            std::memcpy(&word, sieved.data() + t, 8);
+            const auto start = static_cast<std::uint64_t>(turnStart(chunk.firstTurn + t));
+            for (word = ~word; word != 0; word &= word - 1)
+                out = formatter.put(out, start + kWordOffsets[std::countr_zero(word)]);
         }
+    }
+    for (; t < turns; ++t) {
+        unsigned primes = static_cast<std::uint8_t>(~sieved[static_cast<std::size_t>(t)]);
+        const auto start = static_cast<std::uint64_t>(turnStart(chunk.firstTurn + t));
+        for (; primes != 0; primes &= primes - 1)
+            out = formatter.put(out, start + kTurnOffsets[std::countr_zero(primes)]);
     }
     buffer.size = static_cast<std::size_t>(out - data);
     buffer.lastCandidate = static_cast<std::int64_t>(lastCandidate);
