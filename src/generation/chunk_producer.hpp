@@ -1,10 +1,10 @@
 // The front half of the generation job: a pool of sieving threads. The turns to generate are cut
 // into chunks; each thread claims the next chunk, has each group of the shared bucket sieve cross
 // off its large primes in it (every group takes the chunks in claim order, so while one thread
-// works with one group another works with the next), sieves it segment by
-// segment with the medium primes of a wheel sieve of its own (moved on past the chunks that other
-// threads took), counts its primes, and formats them into a buffer of the write pipeline, which
-// writes the buffers in chunk order.
+// works with one group another works with the next), sieves it segment by segment with the
+// medium primes of a wheel sieve of its own (moved on past the chunks that other threads took),
+// counts its primes, and formats them into a buffer of the write pipeline, which writes the
+// buffers in chunk order.
 // Serial numbers of enumerated records run on across chunks: a chunk learns how many records
 // come before it from the chunk before, which is known as soon as that one is sieved, so the
 // formatting of all chunks goes on at once.

@@ -14,7 +14,7 @@
 
 namespace tarn {
 
-// Primes from here on hit a segment of 32 Ki turns less than eight times per progression.
+// Primes from here on hit a segment of 32 Ki turns at most once per progression.
 inline constexpr std::uint32_t kMediumPrimeBound = 1u << 15;
 
 class WheelSieve {
