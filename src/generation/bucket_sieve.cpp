@@ -1,7 +1,5 @@
-// A prime p = 30a + r steps from the multiple p * q to p * (q + s), s the wheel step after q:
-// a * s turns plus a carry that depends only on r and the position of q on the wheel, and the
-// multiple's bit in its turn depends on the same two. So an entry needs only a, r's position, the
-// turn of its next multiple and the wheel position.
+// An entry needs only a and r's position for its prime p = 30a + r (kCrossing), the turn of its
+// next multiple and the wheel position.
 #include "generation/bucket_sieve.hpp"
 
 #include <algorithm>
@@ -16,26 +14,6 @@
 
 namespace tarn {
 namespace {
-
-struct Crossing {
-    std::array<std::array<std::uint8_t, 8>, 8> bit{};    // by residue and wheel position
-    std::array<std::array<std::uint8_t, 8>, 8> carry{};  // turns beyond a * s
-    std::array<std::uint8_t, kSievePeriod> residue{};    // position of p mod 30 on the wheel
-};
-
-constexpr Crossing kCrossing = [] {
-    Crossing c;
-    for (std::uint32_t i = 0; i < 8; ++i) {
-        const std::uint32_t r = kWheelNumbers[i];
-        c.residue[r] = static_cast<std::uint8_t>(i);
-        for (std::uint32_t w = 0; w < 8; ++w) {
-            const std::uint32_t offset = (r * kWheelNumbers[w] + kSievePeriod - kSieveFirst) % 30;
-            c.bit[i][w] = kBitOfOffset[offset];
-            c.carry[i][w] = static_cast<std::uint8_t>((offset + r * kWheelSteps[w]) / 30);
-        }
-    }
-    return c;
-}();
 
 // The longest step between two multiples of p on the wheel, in turns, rounded up.
 std::uint64_t longestStep(std::uint64_t p) { return (6 * p + kSievePeriod - 1) / kSievePeriod + 1; }
@@ -165,9 +143,7 @@ void BucketSieve::activate(Group& group, std::uint64_t horizon) const {
             break;
         }
         ++group.nextPending;
-        const auto packed =
-            static_cast<std::uint32_t>(p / kSievePeriod << 3) | kCrossing.residue[p % kSievePeriod];
-        file(group, packed, chunk, turn - chunk * chunkTurns_, wheel);
+        file(group, packPrime(p), chunk, turn - chunk * chunkTurns_, wheel);
     }
     if (group.nextPending == group.pending.size()) {
         group.pending = {};

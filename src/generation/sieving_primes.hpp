@@ -26,6 +26,34 @@ inline constexpr std::array<std::uint8_t, kSievePeriod> kBitOfOffset = [] {
     return table;
 }();
 
+// A prime p = 30a + r steps from the multiple p * q to p * (q + s), s the wheel step after q:
+// a * s turns plus a carry that depends only on r and the position of q on the wheel, and the
+// multiple's bit in its turn depends on the same two.
+struct Crossing {
+    std::array<std::array<std::uint8_t, 8>, 8> bit{};    // by residue and wheel position
+    std::array<std::array<std::uint8_t, 8>, 8> carry{};  // turns beyond a * s
+    std::array<std::uint8_t, kSievePeriod> residue{};    // position of p mod 30 on the wheel
+};
+
+inline constexpr Crossing kCrossing = [] {
+    Crossing c;
+    for (std::uint32_t i = 0; i < 8; ++i) {
+        const std::uint32_t r = kWheelNumbers[i];
+        c.residue[r] = static_cast<std::uint8_t>(i);
+        for (std::uint32_t w = 0; w < 8; ++w) {
+            const std::uint32_t offset = (r * kWheelNumbers[w] + kSievePeriod - kSieveFirst) % 30;
+            c.bit[i][w] = kBitOfOffset[offset];
+            c.carry[i][w] = static_cast<std::uint8_t>((offset + r * kWheelSteps[w]) / 30);
+        }
+    }
+    return c;
+}();
+
+// p / 30 << 3 | the position of p mod 30 on the wheel: what a walk along p's multiples needs.
+inline constexpr std::uint32_t packPrime(std::uint32_t p) {
+    return static_cast<std::uint32_t>(p / kSievePeriod << 3) | kCrossing.residue[p % kSievePeriod];
+}
+
 // The whole part of the square root, exact for every 64-bit value.
 std::uint64_t wholeSqrt(std::uint64_t n);
 

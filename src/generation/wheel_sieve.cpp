@@ -33,6 +33,10 @@ const std::vector<std::uint8_t>& pattern() {
 
 constexpr std::uint8_t kPatternPrimesInTurn0 = 0b1111;  // 11, 13, 17, 19
 
+// From here a prime hits a segment of 32 Ki turns at most 32 times per progression: one walk
+// along the wheel costs less than eight loops.
+constexpr std::uint32_t kWalkerBound = 1u << 13;
+
 }  // namespace
 
 WheelSieve::WheelSieve(std::int64_t firstTurn, std::int64_t limit)
@@ -42,10 +46,15 @@ WheelSieve::WheelSieve(std::int64_t firstTurn, std::int64_t limit)
         kPatternPrimes.back() + 1,
         static_cast<std::uint32_t>(std::min<std::uint64_t>(root, kMediumPrimeBound - 1)));
     const auto start = static_cast<std::uint64_t>(turnStart(firstTurn));
-    medium_.reserve(primes.size());
     for (const std::uint32_t p : primes) {
         std::uint32_t wheel = 0;
         std::uint64_t m = firstMultiple(p, start, wheel);
+        if (p >= kWalkerBound) {
+            walkers_.push_back(
+                Walker{packPrime(p), wheel,
+                       (m - kSieveFirst) / kSievePeriod - static_cast<std::uint64_t>(firstTurn)});
+            continue;
+        }
         Medium s{p, {}};
         // Eight consecutive multipliers cover every bit once; each repeats every p bytes.
         for (int k = 0; k < 8; ++k) {
@@ -75,6 +84,16 @@ void WheelSieve::skipTo(std::int64_t turn) {
                 next = (s.p - (gap - next) % s.p) % s.p;
         }
     }
+    const auto start = static_cast<std::uint64_t>(turnStart(turn));
+    for (Walker& w : walkers_) {
+        if (w.next >= gap) {
+            w.next -= gap;
+            continue;
+        }
+        const std::uint32_t p = (w.prime >> 3) * kSievePeriod + kWheelNumbers[w.prime & 7];
+        const std::uint64_t m = firstMultiple(p, start, w.wheel);
+        w.next = (m - kSieveFirst) / kSievePeriod - static_cast<std::uint64_t>(turn);
+    }
     turn_ = turn;
     patternAt_ = static_cast<std::size_t>(turn) % kPatternTurns;
 }
@@ -99,6 +118,19 @@ void WheelSieve::sieveNext(std::uint8_t* bytes, std::size_t turns) {
             for (; j < length; j += p) bytes[j] |= mask;
             s.next[b] = j - length;
         }
+    }
+    for (Walker& w : walkers_) {
+        const std::uint64_t a = w.prime >> 3;
+        const auto& bit = kCrossing.bit[w.prime & 7];
+        const auto& carry = kCrossing.carry[w.prime & 7];
+        std::uint64_t t = w.next;
+        std::uint32_t wheel = w.wheel;
+        for (; t < length; wheel = (wheel + 1) & 7) {
+            bytes[t] |= bit[wheel];
+            t += a * kWheelSteps[wheel] + carry[wheel];
+        }
+        w.next = t - length;
+        w.wheel = wheel;
     }
     turn_ += static_cast<std::int64_t>(turns);
 }

@@ -2,10 +2,11 @@
 // byte is one wheel turn: turn t starts at 30t + 11 and bit b stands for 30t + 11 +
 // kTurnOffsets[b], the eight numbers of the turn that have no factor 2, 3 or 5. A segment of
 // turns is small enough to stay in the first-level cache. The multiples of 7 to 19 come from a
-// pattern that repeats every 7 * 11 * 13 * 17 * 19 turns. The other primes hit every segment, so
-// each crosses off along eight fixed-bit progressions of step p bytes (a tight loop per
-// progression); the few thousand of them make a state of a few hundred kilobytes, one per sieving
-// thread. The larger primes wait in the buckets of bucket_sieve.hpp.
+// pattern that repeats every 7 * 11 * 13 * 17 * 19 turns. The other primes hit every segment:
+// those below 2^13 cross off along eight fixed-bit progressions of step p bytes (a tight loop per
+// progression), the rest walk their multiples along the wheel in one loop, which ends once per
+// segment rather than eight times. The few thousand of them make a state of a few hundred
+// kilobytes, one per sieving thread. The larger primes wait in the buckets of bucket_sieve.hpp.
 #pragma once
 
 #include <array>
@@ -37,9 +38,16 @@ private:
         std::array<std::uint64_t, 8> next;  // byte offset from the current segment, per bit
     };
 
+    struct Walker {
+        std::uint32_t prime;  // as packPrime gives it
+        std::uint32_t wheel;  // position of the next multiplier on the wheel
+        std::uint64_t next;   // turn of the next multiple, from the current segment
+    };
+
     std::int64_t turn_;      // first turn of the next segment
     std::size_t patternAt_;  // where turn_ falls in the pattern
     std::vector<Medium> medium_;
+    std::vector<Walker> walkers_;
 };
 
 }  // namespace tarn
