@@ -79,22 +79,22 @@ TEST(GenerationJob, CompleteRunsMatchTheOracle) {
     for (int i = 0; i < 3; ++i) expectComplete(pick(random), i % 2 == 1, i % 3 + 1);
 }
 
-// High up the large primes cross off from their buckets: continued jobs of 10^7 numbers near
-// 10^12 (where a prime's next multiple may lie further out than the buckets reach, so they come
-// round again), 10^14 and the top of the range, against a plain segmented sieve.
+// High up the large primes cross off from their buckets: continued jobs near 10^12 (over 10^7
+// numbers, where the buckets come round again several times), 10^14 and the top of the range,
+// against a plain segmented sieve.
 TEST(GenerationJob, ContinuedRunsHighUpMatchAPlainSegmentedSieve) {
     struct Case {
-        std::int64_t height, chunkTurns;
+        std::int64_t height, span, chunkTurns;
         int threads;
     };
     const std::int64_t top = 922'337'203'685'277;
-    for (const auto& [height, chunkTurns, threads] :
-         std::initializer_list<Case>{{1'000'000'000'000, 4999, 3},
-                                     {100'000'000'000'000, 0, 2},
-                                     {top - 10'000'000, 4096, 2}}) {
+    for (const auto& [height, span, chunkTurns, threads] :
+         std::initializer_list<Case>{{1'000'000'000'000, 10'000'000, 4999, 3},
+                                     {100'000'000'000'000, 4'000'000, 0, 2},
+                                     {top - 2'000'000, 2'000'000, 4096, 2}}) {
         SCOPED_TRACE("height " + std::to_string(height));
         const std::int64_t first = height - (height - 11) % 30;
-        const std::int64_t limit = std::min(first + 10'000'000, top);
+        const std::int64_t limit = std::min(first + span, top);
         TempFolder folder;
         writeFile(folder.path() + "primes.txt", "");
         JobSpec spec{"", limit, threads != 2, true, first, 1000};
