@@ -19,7 +19,7 @@ debs=("$tmp"/out/*.deb)
 deb="${debs[0]}"
 [ -f "$deb" ] || fail "cpack made no .deb"
 
-lintian --fail-on error,warning "$deb" 2>/dev/null || fail "lintian found the errors or warnings above"
+lintian --fail-on error,warning "$deb" || fail "lintian found the errors or warnings above"
 
 info="$(dpkg-deb -I "$deb")"
 depends="$(sed -n 's/^ Depends: //p' <<<"$info")"
