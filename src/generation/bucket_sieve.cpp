@@ -1,11 +1,12 @@
-// An entry needs only a and r's position for its prime p = 30a + r (kCrossing), the turn of its
-// next multiple and the wheel position.
+// An entry needs only a for its prime p = 30a + r, the turn of its next multiple, and the kWalk
+// index, which holds r's position and the multiplier's.
 #include "generation/bucket_sieve.hpp"
 
 #include <algorithm>
 #include <array>
 #include <bit>
 #include <cmath>
+#include <stdexcept>
 #include <utility>
 
 #include "core/wheel.hpp"
@@ -58,9 +59,12 @@ BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int6
       reciprocal_((std::uint64_t{1} << 32) / chunkTurns_),
       chunkCount_(static_cast<std::uint64_t>(std::max<std::int64_t>(endTurn - firstTurn, 0) +
                                              chunkTurns - 1) /
-                  chunkTurns_) {
+                  chunkTurns_),
+      shift_(std::has_single_bit(chunkTurns_) ? std::countr_zero(chunkTurns_) : -1) {
     const std::uint64_t root = limit > 0 ? wholeSqrt(static_cast<std::uint64_t>(limit)) : 0;
     if (root < kMediumPrimeBound || chunkCount_ == 0) return;
+    // The turn within a chunk shares an entry's word with a 6-bit index.
+    if (chunkTurns_ > (std::uint64_t{1} << 26)) throw std::length_error("chunk too long");
     std::vector<std::vector<std::uint32_t>> dealt =
         largePrimes(root, static_cast<std::size_t>(std::max(groups, 1)));
     if (dealt[0].empty()) return;
@@ -79,36 +83,53 @@ BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int6
     // Blocks large enough to fill in long runs, small enough that the partly filled ones stay
     // a small part of the whole.
     const std::size_t perBucket = total / buckets / groups_.size();
-    blockEntries_ = static_cast<std::uint32_t>(std::clamp<std::size_t>(perBucket / 4, 16, 2048));
-    // Each group fills its buckets as it crosses off its first chunk, on a sieving thread.
-    for (Group& group : groups_) group.buckets.assign(2 * buckets, nullptr);
+    blockBytes_ = std::bit_ceil(sizeof(Entry) * std::clamp<std::size_t>(perBucket / 4, 32, 2048));
+    // Each group takes its blocks and fills its buckets as it crosses off its first chunk, on a
+    // sieving thread.
+    for (Group& group : groups_) group.heads.assign(2 * buckets, nullptr);
 }
 
 BucketSieve::~BucketSieve() = default;
 
 std::uint64_t BucketSieve::bytesFor(std::int64_t limit) {
     const double root = std::sqrt(static_cast<double>(std::max<std::int64_t>(limit, 100)));
-    // A pending prime (4 bytes) and its entry (8 bytes) for each, pi(x) < 1.26 x / ln x.
-    return static_cast<std::uint64_t>(12 * 1.26 * root / std::log(root));
+    // For each prime (pi(x) < x / ln x * (1 + 1.2762 / ln x) from x = 599 on): its entry (8 bytes),
+    // up to half as much again in blocks partly filled (a bucket's block holds at most a quarter of
+    // its share, whatever the count of groups), and while it waits to be put in a bucket, its
+    // pending place (4 bytes).
+    const double log = std::log(root);
+    return static_cast<std::uint64_t>(16 * root / log * (1 + 1.2762 / log));
 }
 
-BucketSieve::Block* BucketSieve::freeBlock(Group& group) const {
+BucketSieve::Block* BucketSieve::freeBlock(Group& group) {
     if (!group.free) {
-        group.storage.push_back(
-            std::make_unique<std::byte[]>(sizeof(Block) + blockEntries_ * sizeof(Entry)));
-        auto* block = reinterpret_cast<Block*>(group.storage.back().get());
-        block->next = nullptr;
-        group.free = block;
+        // Blocks come in slabs, aligned by hand: no aligned allocation on every system.
+        constexpr std::size_t kSlab = 32;
+        group.storage.push_back(std::make_unique<std::byte[]>((kSlab + 1) * blockBytes_));
+        auto at = reinterpret_cast<std::uintptr_t>(group.storage.back().get());
+        at = (at + blockBytes_ - 1) & ~(blockBytes_ - 1);
+        for (std::size_t i = 0; i < kSlab; ++i) {
+            auto* block = reinterpret_cast<Block*>(at + i * blockBytes_);
+            block->next = group.free;
+            group.free = block;
+        }
     }
     Block* block = group.free;
     group.free = block->next;
     block->next = nullptr;
-    block->count = 0;
     return block;
 }
 
-inline void BucketSieve::file(Group& group, std::uint32_t prime, std::uint64_t chunk,
-                              std::uint64_t turn, std::uint32_t wheel) const {
+void BucketSieve::spill(Group& group, Entry*& head) {
+    Block* const fresh = freeBlock(group);
+    if (head)
+        fresh->next =
+            reinterpret_cast<Block*>(reinterpret_cast<std::uintptr_t>(head) - blockBytes_);
+    head = fresh->entries();
+}
+
+inline void BucketSieve::file(Group& group, std::uint32_t a, std::uint32_t index,
+                              std::uint64_t chunk, std::uint64_t turn) {
     // The chunk of the turn by a multiplication, one short at most.
     std::uint64_t ahead = (turn * reciprocal_) >> 32;
     turn -= ahead * chunkTurns_;
@@ -118,16 +139,13 @@ inline void BucketSieve::file(Group& group, std::uint32_t prime, std::uint64_t c
     }
     chunk += ahead;
     if (chunk >= chunkCount_) return;  // beyond the job: this prime is done
-    Block*& head = group.buckets[(chunk & bucketMask_) + (once(prime) ? bucketMask_ + 1 : 0)];
-    if (!head || head->count == blockEntries_) [[unlikely]] {
-        Block* block = freeBlock(group);
-        block->next = head;
-        head = block;
-    }
-    head->entries()[head->count++] = Entry{prime, static_cast<std::uint32_t>(turn << 3) | wheel};
+    const std::size_t slot = (chunk & bucketMask_) + (once(a) ? bucketMask_ + 1 : 0);
+    Entry*& head = group.heads[slot];
+    *head++ = entry(a, turn, index);
+    if ((reinterpret_cast<std::uintptr_t>(head) & (blockBytes_ - 1)) == 0) spill(group, head);
 }
 
-void BucketSieve::activate(Group& group, std::uint64_t horizon) const {
+void BucketSieve::activate(Group& group, std::uint64_t horizon) {
     const auto start = static_cast<std::uint64_t>(turnStart(firstTurn_));
     while (group.nextPending < group.pending.size()) {
         const std::uint32_t p = group.pending[group.nextPending];
@@ -143,7 +161,8 @@ void BucketSieve::activate(Group& group, std::uint64_t horizon) const {
             break;
         }
         ++group.nextPending;
-        file(group, packPrime(p), chunk, turn - chunk * chunkTurns_, wheel);
+        file(group, static_cast<std::uint32_t>(p / kSievePeriod), walkIndex(p, wheel), chunk,
+             turn - chunk * chunkTurns_);
     }
     if (group.nextPending == group.pending.size()) {
         group.pending = {};
@@ -154,58 +173,75 @@ void BucketSieve::activate(Group& group, std::uint64_t horizon) const {
 void BucketSieve::crossOffNext(int index, std::uint8_t* bytes, std::int64_t turns) {
     Group& group = groups_[static_cast<std::size_t>(index)];
     const std::uint64_t chunk = group.chunk++;
+    if (chunk == 0)
+        for (Entry*& head : group.heads) spill(group, head);
     if (!group.pending.empty()) activate(group, chunk + bucketMask_);
-    crossOff<false>(group, chunk, bytes, static_cast<std::uint64_t>(turns));
-    crossOff<true>(group, chunk, bytes, static_cast<std::uint64_t>(turns));
+    const auto length = static_cast<std::uint64_t>(turns);
+    if (shift_ >= 0) {
+        crossOff<false, true>(group, chunk, bytes, length);
+        crossOff<true, true>(group, chunk, bytes, length);
+    } else {
+        crossOff<false, false>(group, chunk, bytes, length);
+        crossOff<true, false>(group, chunk, bytes, length);
+    }
 }
 
-template <bool kOnce>
+template <bool kOnce, bool kShift>
 void BucketSieve::crossOff(Group& group, std::uint64_t chunk, std::uint8_t* bytes,
                            std::uint64_t length) {
+    const std::size_t base = kOnce ? bucketMask_ + 1 : 0;
+    Entry*& bucket = group.heads[base + (chunk & bucketMask_)];
+    // The bucket starts afresh: what lands in it now belongs to a chunk after the job's end.
+    const Entry* end = std::exchange(bucket, nullptr);
+    spill(group, bucket);
+    auto* block =
+        reinterpret_cast<Block*>(reinterpret_cast<std::uintptr_t>(end) & ~(blockBytes_ - 1));
     // Held in locals: the byte stores below could alias any member.
     const std::uint64_t chunkTurns = chunkTurns_, reciprocal = reciprocal_, mask = bucketMask_;
+    const auto shift = static_cast<unsigned>(shift_);
     const std::uint64_t chunksLeft = chunkCount_ - chunk;
-    const std::uint32_t blockEntries = blockEntries_;
-    Block** const buckets = group.buckets.data() + (kOnce ? mask + 1 : 0);
-    Block* block = std::exchange(buckets[chunk & mask], nullptr);
-    while (block) {
-        const Entry* entry = block->entries();
-        const Entry* const end = entry + block->count;
-        for (; entry != end; ++entry) {
-            const std::uint32_t prime = entry->prime;
-            const std::uint64_t a = prime >> 3;
-            const auto& bit = kCrossing.bit[prime & 7];
-            const auto& carry = kCrossing.carry[prime & 7];
-            std::uint64_t turn = entry->place >> 3;
-            std::uint32_t wheel = entry->place & 7;
+    const std::uintptr_t blockBytes = blockBytes_;
+    Entry** const heads = group.heads.data() + base;
+    for (;;) {
+        for (const Entry* at = block->entries(); at != end; ++at) {
+            const Entry e = *at;
+            const std::uint64_t a = e & 0xffffffff;
+            std::uint64_t turn = e >> 38;
+            std::uint32_t step = (e >> 32) & 63;
             // Filed here, the next multiple lies in this chunk; primes whose shortest step
             // spans a chunk have no other.
             do {
-                bytes[turn] |= bit[wheel];
-                turn += a * kWheelSteps[wheel] + carry[wheel];
-                wheel = (wheel + 1) & 7;
+                const WalkStep& walk = kWalk[step];
+                const std::uint8_t bit = walk.bit;
+                step = walk.next;
+                const std::uint64_t next = turn + a * walk.step + walk.carry;
+                bytes[turn] |= bit;
+                turn = next;
             } while (!kOnce && turn < length);
-            // The chunk of the next multiple by a multiplication, one short at most.
-            std::uint64_t ahead = (turn * reciprocal) >> 32;
-            turn -= ahead * chunkTurns;
-            if (turn >= chunkTurns) {
-                turn -= chunkTurns;
-                ++ahead;
+            std::uint64_t ahead;
+            if constexpr (kShift) {
+                ahead = turn >> shift;
+                turn &= chunkTurns - 1;
+            } else {
+                // The chunk of the next multiple by a multiplication, one short at most.
+                ahead = (turn * reciprocal) >> 32;
+                turn -= ahead * chunkTurns;
+                if (turn >= chunkTurns) {
+                    turn -= chunkTurns;
+                    ++ahead;
+                }
             }
             if (ahead >= chunksLeft) continue;  // beyond the job: this prime is done
-            Block*& head = buckets[(chunk + ahead) & mask];
-            if (!head || head->count == blockEntries) [[unlikely]] {
-                Block* const fresh = freeBlock(group);
-                fresh->next = head;
-                head = fresh;
-            }
-            head->entries()[head->count++] =
-                Entry{prime, static_cast<std::uint32_t>(turn << 3) | wheel};
+            Entry*& head = heads[(chunk + ahead) & mask];
+            *head++ = entry(a, turn, step);
+            if ((reinterpret_cast<std::uintptr_t>(head) & (blockBytes - 1)) == 0) [[unlikely]]
+                spill(group, head);
         }
-        Block* const next = block->next;
-        block->next = group.free;
+        Block* const more = std::exchange(block->next, group.free);
         group.free = block;
-        block = next;
+        if (!more) break;
+        block = more;
+        end = reinterpret_cast<const Entry*>(reinterpret_cast<std::uintptr_t>(block) + blockBytes);
     }
 }
 

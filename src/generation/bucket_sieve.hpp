@@ -31,17 +31,22 @@ public:
     // different groups may run at once.
     void crossOffNext(int group, std::uint8_t* bytes, std::int64_t turns);
 
-    // About the bytes it takes for a limit, for the thread pool's memory budget.
+    // About the bytes it takes for a limit, whatever the count of groups, for the thread pool's
+    // memory budget.
     static std::uint64_t bytesFor(std::int64_t limit);
 
 private:
-    struct Entry {
-        std::uint32_t prime;  // p / 30 << 3 | the position of p mod 30 on the wheel
-        std::uint32_t place;  // turn of the next multiple within its chunk << 3 | wheel position
-    };
+    // p / 30 for the prime p | (the turn of its next multiple within its chunk << 6 | the kWalk
+    // index) << 32: one load and one store a multiple.
+    using Entry = std::uint64_t;
+    static constexpr Entry entry(std::uint64_t a, std::uint64_t turn, std::uint32_t index) {
+        return a | (turn << 6 | index) << 32;
+    }
+    // Blocks are aligned to their size, so a bucket's write pointer tells by its address when
+    // its block is full; the entries follow the header up to the block's end.
     struct Block {
-        Block* next;
-        std::uint32_t count;
+        Block* next;  // the bucket's block filled before this one
+        std::uint64_t unused;
         Entry* entries() { return reinterpret_cast<Entry*>(this + 1); }
     };
     struct Group {
@@ -49,29 +54,32 @@ private:
         std::vector<std::uint32_t> pending;  // primes not yet in a bucket, ascending
         std::size_t nextPending = 0;
         // By chunk modulo their count, then the same for the primes that hit a chunk once at
-        // most; the head block is filling.
-        std::vector<Block*> buckets;
+        // most: where the next entry goes, never at a block's end.
+        std::vector<Entry*> heads;
         Block* free = nullptr;
         std::vector<std::unique_ptr<std::byte[]>> storage;
     };
 
     // A prime whose shortest step (2p / 30 turns) spans a chunk.
-    bool once(std::uint32_t prime) const { return 2 * std::uint64_t{prime >> 3} >= chunkTurns_; }
-    void activate(Group& group, std::uint64_t horizon) const;
-    template <bool kOnce>
+    bool once(std::uint32_t a) const { return 2 * std::uint64_t{a} >= chunkTurns_; }
+    void activate(Group& group, std::uint64_t horizon);
+    template <bool kOnce, bool kShift>
     void crossOff(Group& group, std::uint64_t chunk, std::uint8_t* bytes, std::uint64_t length);
     // Files an entry whose next multiple is `turn` (below 2^32) turns after the start of
     // chunk `chunk`.
-    void file(Group& group, std::uint32_t prime, std::uint64_t chunk, std::uint64_t turn,
-              std::uint32_t wheel) const;
-    Block* freeBlock(Group& group) const;
+    void file(Group& group, std::uint32_t a, std::uint32_t index, std::uint64_t chunk,
+              std::uint64_t turn);
+    Block* freeBlock(Group& group);
+    // The bucket whose block ends at `head` (or has none) gets a fresh one.
+    void spill(Group& group, Entry*& head);
 
     const std::int64_t firstTurn_;
     const std::uint64_t chunkTurns_;
     const std::uint64_t reciprocal_;  // 2^32 / chunkTurns, for the chunk of a turn
     const std::uint64_t chunkCount_;
+    const int shift_;  // log2 of chunkTurns when that is a power of two, else -1
     std::uint64_t bucketMask_ = 0;
-    std::uint32_t blockEntries_ = 0;
+    std::uintptr_t blockBytes_ = 0;
     std::vector<Group> groups_;
 };
 

@@ -49,6 +49,30 @@ inline constexpr Crossing kCrossing = [] {
     return c;
 }();
 
+// One step of a walk along p's multiples, by the position of p mod 30 on the wheel times 8 plus
+// the position of the multiplier: one table read per multiple, where the walk then goes on.
+struct WalkStep {
+    std::uint8_t bit;    // the multiple's bit in its turn
+    std::uint8_t step;   // wheel step to the next multiplier: a * step turns ...
+    std::uint8_t carry;  // ... plus this many
+    std::uint8_t next;   // index of the next step
+};
+
+inline constexpr std::array<WalkStep, 64> kWalk = [] {
+    std::array<WalkStep, 64> walk{};
+    for (std::uint32_t r = 0; r < 8; ++r)
+        for (std::uint32_t w = 0; w < 8; ++w)
+            walk[8 * r + w] = {kCrossing.bit[r][w], static_cast<std::uint8_t>(kWheelSteps[w]),
+                               kCrossing.carry[r][w],
+                               static_cast<std::uint8_t>(8 * r + (w + 1) % 8)};
+    return walk;
+}();
+
+// The kWalk index of prime p's multiple with the multiplier at position `wheel`.
+inline constexpr std::uint32_t walkIndex(std::uint32_t p, std::uint32_t wheel) {
+    return 8u * kCrossing.residue[p % kSievePeriod] + wheel;
+}
+
 // p / 30 << 3 | the position of p mod 30 on the wheel: what a walk along p's multiples needs.
 inline constexpr std::uint32_t packPrime(std::uint32_t p) {
     return static_cast<std::uint32_t>(p / kSievePeriod << 3) | kCrossing.residue[p % kSievePeriod];
