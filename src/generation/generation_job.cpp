@@ -29,22 +29,50 @@ namespace {
 
 constexpr std::int64_t kSegmentTurns = 32 * 1024;  // 32 KiB of sieve: the first-level cache
 constexpr std::int64_t kSeedCount = 4;             // 2, 3, 5 and 7 come before the first turn
-constexpr std::int64_t kSegmentsPerChunk = 4;      // 2 to 5 MiB of records per write
+constexpr std::int64_t kSegmentsPerChunk = 4;      // 2 to 5 MiB of records per write, at most
 // Memory for the sieve and the buffers, whatever the core count.
 constexpr std::uint64_t kSieveBudget = 56u << 20;
-constexpr std::uint64_t kChunkRecordBytes = 40;  // per turn at most, in practice
+constexpr double kChunkRecordBytes = 40;               // per turn at most, from the first turns on
+constexpr std::uint64_t kSieveThreadBytes = 2u << 20;  // a wheel sieve, blocks, stack, heap
 
-// One sieving thread per core, as many as the memory budget holds: the large primes' buckets
-// (about 27 MB at the top of the range) are shared, and each thread fills a chunk buffer (two
-// buffers more keep the writer busy) and keeps a few hundred kilobytes of its own.
-int sievingThreads(int requested, std::int64_t limit, std::int64_t chunkTurns) {
-    int threads = requested > 0 ? requested : static_cast<int>(std::thread::hardware_concurrency());
-    const std::uint64_t shared = BucketSieve::bytesFor(limit);
-    const std::uint64_t chunkBytes =
-        static_cast<std::uint64_t>(chunkTurns) * (kChunkRecordBytes + 1);
-    const auto buffers =
-        static_cast<int>((kSieveBudget - std::min(shared, kSieveBudget)) / chunkBytes);
-    return std::clamp(threads, 1, std::max(buffers - 2, 1));
+// At most the record bytes a turn of the job takes: its first turns are the densest, and the
+// count of primes in a chunk strays from the estimate by far less than the margin.
+double recordBytesPerTurn(std::int64_t firstCandidate, std::int64_t limit, bool enumerated) {
+    if (firstCandidate < 100'000'000) return kChunkRecordBytes;
+    const double primesPerTurn =
+        1.15 * kWheelPeriod / std::log(static_cast<double>(firstCandidate));
+    const auto digits = static_cast<double>(std::to_string(limit).size());
+    return primesPerTurn * (digits + 2 + (enumerated ? digits + 1 : 0));
+}
+
+struct SievingPool {
+    int threads = 1;
+    std::int64_t chunkTurns = 0;
+};
+
+// One sieving thread per core. The large primes' buckets are shared (about 30 MB at the top of
+// the range); each thread fills a chunk buffer (two buffers more keep the writer busy) and keeps
+// a chunk of sieve, its share of the buckets' partly filled blocks and a wheel sieve. Where the
+// memory budget holds fewer threads than cores, chunks of fewer segments make the buffers
+// smaller, down to one segment; past that, fewer threads.
+SievingPool sievingPool(const JobSpec& spec, std::int64_t firstCandidate, const JobHooks& hooks,
+                        std::int64_t segmentTurns) {
+    const int cores =
+        spec.threads > 0 ? spec.threads : static_cast<int>(std::thread::hardware_concurrency());
+    const std::uint64_t shared = BucketSieve::bytesFor(spec.limit);
+    const double perTurn = recordBytesPerTurn(firstCandidate, spec.limit, spec.enumerated);
+    SievingPool pool;
+    for (std::int64_t segments = kSegmentsPerChunk;; segments /= 2) {
+        pool.chunkTurns = hooks.turnsPerChunk > 0 ? hooks.turnsPerChunk : segmentTurns * segments;
+        const auto buffer =
+            static_cast<std::uint64_t>(static_cast<double>(pool.chunkTurns) * perTurn);
+        const std::uint64_t perThread =
+            buffer + static_cast<std::uint64_t>(pool.chunkTurns) + kSieveThreadBytes;
+        const std::uint64_t fixed = std::min(shared + 2 * buffer, kSieveBudget);
+        const auto fits = static_cast<int>((kSieveBudget - fixed) / perThread);
+        pool.threads = std::clamp(cores, 1, std::max(fits, 1));
+        if (fits >= cores || segments == 1 || hooks.turnsPerChunk > 0) return pool;
+    }
 }
 
 // A fresh file starts with the records of 2, 3, 5 and 7, which no turn holds.
@@ -158,10 +186,9 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
     plan.firstSequence = spec.append ? 0 : 1;
     plan.enumerated = spec.enumerated;
     plan.segmentTurns = hooks.turnsPerBatch > 0 ? hooks.turnsPerBatch : kSegmentTurns;
-    plan.chunkTurns =
-        hooks.turnsPerChunk > 0 ? hooks.turnsPerChunk : plan.segmentTurns * kSegmentsPerChunk;
-
-    const int threads = sievingThreads(spec.threads, spec.limit, plan.chunkTurns);
+    const SievingPool pool = sievingPool(spec, firstTurnStart, hooks, plan.segmentTurns);
+    plan.chunkTurns = pool.chunkTurns;
+    const int threads = pool.threads;
     // The large primes' buckets are built before any file is touched: at the top of the range
     // they are the job's largest piece of memory.
     std::optional<BucketSieve> large;
