@@ -16,7 +16,8 @@ namespace tarn {
 class BucketSieve {
 public:
     // For the chunks of `chunkTurns` turns from `firstTurn` up to `endTurn` (the last one may be
-    // shorter), for numbers up to `limit`, with the primes dealt into `groups` groups.
+    // shorter), for numbers up to `limit`, with the primes dealt into `groups` groups; fills the
+    // buckets for the first chunks, a thread for each group.
     BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int64_t limit,
                 std::int64_t chunkTurns, int groups);
     ~BucketSieve();
