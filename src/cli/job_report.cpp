@@ -1,7 +1,5 @@
 #include "cli/job_report.hpp"
 
-#include <unistd.h>
-
 #include <CLI/CLI.hpp>
 #include <cstdio>
 #include <iostream>
@@ -10,6 +8,7 @@
 #include "cli/cli_context.hpp"
 #include "cli/standard_output.hpp"
 #include "generation/job_texts.hpp"
+#include "platform/process.hpp"
 
 namespace tarn::cli {
 
@@ -28,7 +27,7 @@ std::string clockText(double seconds) {
 
 ProgressLine::ProgressLine(const JobProgress& progress, std::int64_t from, std::int64_t limit)
     : progress_(progress), from_(from), limit_(limit) {
-    if (::isatty(2)) thread_ = std::thread([this] { run(); });
+    if (platform::isTerminal(platform::Stream::Error)) thread_ = std::thread([this] { run(); });
 }
 
 ProgressLine::~ProgressLine() {

@@ -24,8 +24,8 @@ std::string AppFolder() {
 
 bool FileExists(const std::string& name) {
     if (name.empty() || name.back() == kPathSeparator || name.back() == '/') return false;
-    const fs::path path(name);
-    const std::string leaf = path.filename().string();
+    const fs::path path = pathFromUtf8(name);
+    const std::string leaf = utf8(path.filename());
     if (!leaf.empty() && leaf.front() == '.') return false;  // hidden on this system
     std::error_code ec;
     return fs::is_regular_file(path, ec) && !ec;

@@ -4,7 +4,6 @@
 #include "tools/split_results.hpp"
 
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -65,8 +64,8 @@ std::int64_t lineEnds(const std::string& text) {
 
 // A system write that takes at most `limit` bytes at a time.
 SplitWriteFunction shortWrites(std::size_t limit) {
-    return [limit](int fd, const char* bytes, std::size_t count) -> std::ptrdiff_t {
-        return ::write(fd, bytes, std::min(count, limit));
+    return [limit](platform::File& file, const char* bytes, std::size_t count, int& error) {
+        return file.writeSome(bytes, std::min(count, limit), error);
     };
 }
 
@@ -255,14 +254,15 @@ TEST_F(SplitFixture, AWriteTheSystemRefusesFailsTheSplitAndNamesTheFile) {
         SCOPED_TRACE(f.reason.empty() ? "interrupted" : f.reason);
         std::size_t written = 0;
         bool faulted = false;
-        const SplitWriteFunction faulty = [&](int fd, const char* bytes,
-                                              std::size_t count) -> std::ptrdiff_t {
+        const SplitWriteFunction faulty = [&](platform::File& file, const char* bytes,
+                                              std::size_t count, int& error) -> std::ptrdiff_t {
             if (written > firstFile && !faulted) {
                 faulted = true;
-                errno = f.error;
+                error = f.error;
                 return f.answer;
             }
-            const ssize_t done = ::write(fd, bytes, std::min<std::size_t>(count, 4096));
+            const std::ptrdiff_t done =
+                file.writeSome(bytes, std::min<std::size_t>(count, 4096), error);
             if (done > 0) written += static_cast<std::size_t>(done);
             return done;
         };
