@@ -77,4 +77,7 @@ int run(int argc, char** argv) {
 
 }  // namespace
 
-int main(int argc, char** argv) { return tarn::cli::finishStandardOutput(run(argc, argv)); }
+int main(int argc, char** argv) {
+    tarn::platform::useBinaryStandardStreams();
+    return tarn::cli::finishStandardOutput(run(argc, argv));
+}

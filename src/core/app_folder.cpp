@@ -11,7 +11,9 @@ namespace fs = std::filesystem;
 namespace tarn {
 
 std::string withTrailingSeparator(std::string folder) {
-    if (folder.empty() || folder.back() != kPathSeparator) folder += kPathSeparator;
+    // '/' separates folders on Windows too.
+    if (folder.empty() || (folder.back() != kPathSeparator && folder.back() != '/'))
+        folder += kPathSeparator;
     return folder;
 }
 

@@ -14,13 +14,22 @@
 namespace tarn::platform {
 namespace {
 
-// A folder in the file's place is refused as "access denied"; say what POSIX says.
+bool isFolder(const std::wstring& path) {
+    const DWORD attributes = GetFileAttributesW(path.c_str());
+    return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY);
+}
+
+// A folder in the file's place is refused as "access denied", a file in the place of its folder
+// as "path not found"; say what POSIX says.
 int openErrno(const std::wstring& path) {
     const DWORD error = GetLastError();
-    if (error == ERROR_ACCESS_DENIED) {
-        const DWORD attributes = GetFileAttributesW(path.c_str());
-        if (attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY))
-            return EISDIR;
+    if (error == ERROR_ACCESS_DENIED && isFolder(path)) return EISDIR;
+    if (error == ERROR_PATH_NOT_FOUND) {
+        const std::size_t cut = path.find_last_of(L"\\/");
+        const std::wstring parent = cut == std::wstring::npos ? L"" : path.substr(0, cut);
+        if (!parent.empty() && GetFileAttributesW(parent.c_str()) != INVALID_FILE_ATTRIBUTES &&
+            !isFolder(parent))
+            return ENOTDIR;
     }
     return errnoOf(error);
 }

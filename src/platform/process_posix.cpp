@@ -60,6 +60,8 @@ void onStopRequest(void (*onStop)()) {
     for (const int signal : {SIGINT, SIGTERM, SIGHUP}) sigaction(signal, &action, nullptr);
 }
 
+void useBinaryStandardStreams() {}
+
 std::vector<std::string> utf8Arguments(int argc, char** argv) {
     // The arguments are bytes, taken as the user typed them.
     return std::vector<std::string>(argv, argv + argc);

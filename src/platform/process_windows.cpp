@@ -3,10 +3,13 @@
 #endif
 #include <windows.h>
 // shellapi.h needs windows.h first.
+#include <fcntl.h>
+#include <io.h>
 #include <shellapi.h>
 
 #include <algorithm>
 #include <cerrno>
+#include <cstdio>
 
 #include "platform/files.hpp"
 #include "platform/process.hpp"
@@ -93,11 +96,21 @@ std::ptrdiff_t readInput(char* data, std::size_t size, int& error) {
     return static_cast<std::ptrdiff_t>(got);
 }
 
-bool isTerminal(Stream stream) { return isConsole(handleOf(stream)); }
+bool isTerminal(Stream stream) {
+    const HANDLE h = handleOf(stream);
+    DWORD mode = 0;
+    if (!isConsole(h) || !GetConsoleMode(h, &mode)) return false;
+    return (mode & ENABLE_VIRTUAL_TERMINAL_PROCESSING) ||
+           SetConsoleMode(h, mode | ENABLE_VIRTUAL_TERMINAL_PROCESSING);
+}
 
 void onStopRequest(void (*onStop)()) {
     g_onStop = onStop;
     SetConsoleCtrlHandler(onConsoleEvent, TRUE);
+}
+
+void useBinaryStandardStreams() {
+    for (FILE* stream : {stdin, stdout, stderr}) _setmode(_fileno(stream), _O_BINARY);
 }
 
 std::vector<std::string> utf8Arguments(int argc, char** argv) {

@@ -23,10 +23,11 @@ public:
     ChildProcess& operator=(const ChildProcess&) = delete;
 
     bool started() const;
-    // Ctrl-C (SIGINT; on Windows Ctrl-Break, the event a process group can be sent).
-    void interrupt();
+    // Ctrl-C (SIGINT; on Windows Ctrl-Break, the event a process group can be sent). False when
+    // it cannot be sent: Wine has no console events between Windows processes.
+    bool interrupt();
     // The system asking the program to end (SIGTERM; on Windows the same console event).
-    void terminate();
+    bool terminate();
     void kill();
     // The exit code, or 128 + the signal that ended it; -1 when the program did not start.
     int wait();

@@ -47,8 +47,8 @@ ChildProcess::~ChildProcess() {
 }
 
 bool ChildProcess::started() const { return state_->pid > 0; }
-void ChildProcess::interrupt() { ::kill(state_->pid, SIGINT); }
-void ChildProcess::terminate() { ::kill(state_->pid, SIGTERM); }
+bool ChildProcess::interrupt() { return ::kill(state_->pid, SIGINT) == 0; }
+bool ChildProcess::terminate() { return ::kill(state_->pid, SIGTERM) == 0; }
 void ChildProcess::kill() { ::kill(state_->pid, SIGKILL); }
 
 int ChildProcess::wait() {

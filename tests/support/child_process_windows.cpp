@@ -77,11 +77,11 @@ ChildProcess::~ChildProcess() {
 
 bool ChildProcess::started() const { return state_->process.hProcess != nullptr; }
 
-void ChildProcess::interrupt() {
-    GenerateConsoleCtrlEvent(CTRL_BREAK_EVENT, state_->process.dwProcessId);
+bool ChildProcess::interrupt() {
+    return GenerateConsoleCtrlEvent(CTRL_BREAK_EVENT, state_->process.dwProcessId);
 }
 
-void ChildProcess::terminate() { interrupt(); }
+bool ChildProcess::terminate() { return interrupt(); }
 
 void ChildProcess::kill() { TerminateProcess(state_->process.hProcess, kKilledExitCode); }
 

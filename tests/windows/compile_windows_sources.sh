@@ -26,4 +26,3 @@ compile() {
     echo "compiled $f"
 }
 compile ui/shell/desktop_shell_windows.cpp "${ui[@]}"
-compile ui/shell/utf16.cpp "${ui[@]}"
