@@ -29,13 +29,23 @@ int writeAllWith(WriteSome&& writeSome, const char* data, std::size_t size, std:
     return 0;
 }
 
+// Which file a handle or a path names, and its size, so that a job can tell whether the file at
+// its path is still the one it writes.
+struct FileIdentity {
+    std::uint64_t device = 0;
+    std::uint64_t index = 0;
+    std::uint64_t size = 0;
+    bool operator==(const FileIdentity&) const = default;
+};
+
 class File {
 public:
     enum class Mode {
         Read,
-        ReadNoWait,  // a pipe or device in the file's place cannot hold up the open
-        Create,      // write, created or emptied
-        Append,      // write at the end, created when missing
+        ReadNoWait,     // a pipe or device in the file's place cannot hold up the open
+        Create,         // write, created or emptied
+        Append,         // every write at the end, created when missing
+        AppendEmptied,  // every write at the end, created or emptied
     };
     File() = default;
     ~File() { close(); }
@@ -63,6 +73,7 @@ public:
     // Tells the system that the file will be read from start to end.
     void adviseSequential();
     int size(std::uint64_t& bytes) const;
+    int identity(FileIdentity& identity) const;
     // Cuts the file to `bytes` and moves the position there.
     int truncate(std::uint64_t bytes);
     int close();
@@ -74,13 +85,17 @@ private:
     using Handle = int;
 #endif
     static constexpr Handle kClosed = -1;
-    explicit File(Handle handle) : handle_(handle) {}
+    File(Handle handle, bool append) : handle_(handle), append_(append) {}
     Handle handle_ = kClosed;
+    bool append_ = false;  // Windows: every write at the end (POSIX: O_APPEND does it)
 };
 
 // Replaces the file with `content` so that a crash at any moment leaves the old file or the new
 // one: written to `path` + ".tmp", synced, renamed over `path`, and the rename made durable.
 int replaceFileDurably(const std::string& path, std::string_view content);
+
+// The identity of the file at `path`; ENOENT when nothing is there.
+int pathIdentity(const std::string& path, FileIdentity& identity);
 
 // Cuts the file at `path` to `bytes`.
 int truncateFile(const std::string& path, std::uint64_t bytes);

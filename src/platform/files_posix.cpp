@@ -10,12 +10,14 @@
 
 namespace tarn::platform {
 
-File::File(File&& other) noexcept : handle_(std::exchange(other.handle_, kClosed)) {}
+File::File(File&& other) noexcept
+    : handle_(std::exchange(other.handle_, kClosed)), append_(other.append_) {}
 
 File& File::operator=(File&& other) noexcept {
     if (this != &other) {
         close();
         handle_ = std::exchange(other.handle_, kClosed);
+        append_ = other.append_;
     }
     return *this;
 }
@@ -35,10 +37,13 @@ File File::open(const std::string& path, Mode mode, int& error) {
         case Mode::Append:
             flags |= O_WRONLY | O_CREAT | O_APPEND;
             break;
+        case Mode::AppendEmptied:
+            flags |= O_WRONLY | O_CREAT | O_APPEND | O_TRUNC;
+            break;
     }
     const int fd = ::open(path.c_str(), flags, 0644);
     error = fd < 0 ? errno : 0;
-    return File(fd);
+    return File(fd, mode == Mode::Append || mode == Mode::AppendEmptied);
 }
 
 bool File::isOpen() const { return handle_ >= 0; }
@@ -79,6 +84,27 @@ int File::size(std::uint64_t& bytes) const {
     struct stat info {};
     if (::fstat(handle_, &info) != 0) return errno;
     bytes = static_cast<std::uint64_t>(info.st_size);
+    return 0;
+}
+
+namespace {
+FileIdentity identityOf(const struct stat& info) {
+    return {static_cast<std::uint64_t>(info.st_dev), static_cast<std::uint64_t>(info.st_ino),
+            static_cast<std::uint64_t>(info.st_size)};
+}
+}  // namespace
+
+int File::identity(FileIdentity& identity) const {
+    struct stat info {};
+    if (::fstat(handle_, &info) != 0) return errno;
+    identity = identityOf(info);
+    return 0;
+}
+
+int pathIdentity(const std::string& path, FileIdentity& identity) {
+    struct stat info {};
+    if (::stat(path.c_str(), &info) != 0) return errno;
+    identity = identityOf(info);
     return 0;
 }
 

@@ -41,12 +41,14 @@ DWORD chunk(std::size_t size) { return static_cast<DWORD>(std::min<std::size_t>(
 
 }  // namespace
 
-File::File(File&& other) noexcept : handle_(std::exchange(other.handle_, kClosed)) {}
+File::File(File&& other) noexcept
+    : handle_(std::exchange(other.handle_, kClosed)), append_(other.append_) {}
 
 File& File::operator=(File&& other) noexcept {
     if (this != &other) {
         close();
         handle_ = std::exchange(other.handle_, kClosed);
+        append_ = other.append_;
     }
     return *this;
 }
@@ -55,9 +57,10 @@ File File::open(const std::string& path, Mode mode, int& error) {
     const std::wstring wide = widen(path);
     const bool reads = mode == Mode::Read || mode == Mode::ReadNoWait;
     const DWORD access = reads ? GENERIC_READ : GENERIC_WRITE;
+    const bool append = mode == Mode::Append || mode == Mode::AppendEmptied;
     const DWORD creation = reads                  ? OPEN_EXISTING
-                           : mode == Mode::Create ? CREATE_ALWAYS
-                                                  : OPEN_ALWAYS;
+                           : mode == Mode::Append ? OPEN_ALWAYS
+                                                  : CREATE_ALWAYS;
     // Others may read, write, rename or delete, as on POSIX.
     const DWORD share = FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE;
     const HANDLE h =
@@ -66,16 +69,8 @@ File File::open(const std::string& path, Mode mode, int& error) {
         error = openErrno(wide);
         return File();
     }
-    File file(reinterpret_cast<std::intptr_t>(h));
-    if (mode == Mode::Append) {
-        LARGE_INTEGER zero{};
-        if (!SetFilePointerEx(h, zero, nullptr, FILE_END)) {
-            error = lastErrno();
-            return File();
-        }
-    }
     error = 0;
-    return file;
+    return File(reinterpret_cast<std::intptr_t>(h), append);
 }
 
 bool File::isOpen() const { return handle_ != kClosed; }
@@ -95,7 +90,10 @@ std::ptrdiff_t File::read(char* data, std::size_t size, int& error) {
 
 std::ptrdiff_t File::writeSome(const char* data, std::size_t size, int& error) {
     DWORD done = 0;
-    if (!WriteFile(native(handle_), data, chunk(size), &done, nullptr)) {
+    // An offset of all ones writes at the end of the file, wherever others have put it.
+    OVERLAPPED atEnd{};
+    atEnd.Offset = atEnd.OffsetHigh = 0xFFFFFFFF;
+    if (!WriteFile(native(handle_), data, chunk(size), &done, append_ ? &atEnd : nullptr)) {
         error = lastErrno();
         return -1;
     }
@@ -121,6 +119,30 @@ int File::size(std::uint64_t& bytes) const {
     if (!GetFileSizeEx(native(handle_), &size)) return lastErrno();
     bytes = static_cast<std::uint64_t>(size.QuadPart);
     return 0;
+}
+
+namespace {
+int identityOf(HANDLE h, FileIdentity& identity) {
+    BY_HANDLE_FILE_INFORMATION info{};
+    if (!GetFileInformationByHandle(h, &info)) return lastErrno();
+    identity = {info.dwVolumeSerialNumber,
+                (std::uint64_t{info.nFileIndexHigh} << 32) | info.nFileIndexLow,
+                (std::uint64_t{info.nFileSizeHigh} << 32) | info.nFileSizeLow};
+    return 0;
+}
+}  // namespace
+
+int File::identity(FileIdentity& identity) const { return identityOf(native(handle_), identity); }
+
+int pathIdentity(const std::string& path, FileIdentity& identity) {
+    const std::wstring wide = widen(path);
+    const HANDLE h =
+        CreateFileW(wide.c_str(), 0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                    nullptr, OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS, nullptr);
+    if (h == INVALID_HANDLE_VALUE) return openErrno(wide);
+    const int error = identityOf(h, identity);
+    CloseHandle(h);
+    return error;
 }
 
 int File::truncate(std::uint64_t bytes) {

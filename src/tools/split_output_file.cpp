@@ -3,6 +3,7 @@
 // short write (a signal, a nearly full disk) never loses or reorders a byte.
 #include "tools/split_output_file.hpp"
 
+#include <algorithm>
 #include <cstring>
 #include <utility>
 
@@ -17,6 +18,7 @@ SplitOutputFile::~SplitOutputFile() = default;
 
 bool SplitOutputFile::open(std::string name) {
     name_ = std::move(name);
+    size_ = 0;
     int error = 0;
     file_ = platform::File::open(name_, platform::File::Mode::Create, error);
     return error == 0 || fail(error);
@@ -36,6 +38,13 @@ bool SplitOutputFile::close() {
     return ok;
 }
 
+bool SplitOutputFile::dropLast(std::uint64_t count) {
+    if (!flush()) return false;
+    size_ -= std::min(size_, count);
+    const int error = file_.truncate(size_);
+    return error == 0 || fail(error);
+}
+
 bool SplitOutputFile::flush() {
     const std::size_t count = used_;
     used_ = 0;
@@ -50,6 +59,7 @@ bool SplitOutputFile::put(const char* bytes, std::size_t count) {
                                        },
                                        bytes, count, written)
                                  : file_.writeAll(bytes, count, written);
+    size_ += written;
     return error == 0 || fail(error);
 }
 

@@ -28,6 +28,8 @@ public:
     bool interrupt();
     // The system asking the program to end (SIGTERM; on Windows the same console event).
     bool terminate();
+    // The terminal going away (SIGHUP; on Windows the same console event).
+    bool hangUp();
     void kill();
     // The exit code, or 128 + the signal that ended it; -1 when the program did not start.
     int wait();

@@ -49,6 +49,7 @@ ChildProcess::~ChildProcess() {
 bool ChildProcess::started() const { return state_->pid > 0; }
 bool ChildProcess::interrupt() { return ::kill(state_->pid, SIGINT) == 0; }
 bool ChildProcess::terminate() { return ::kill(state_->pid, SIGTERM) == 0; }
+bool ChildProcess::hangUp() { return ::kill(state_->pid, SIGHUP) == 0; }
 void ChildProcess::kill() { ::kill(state_->pid, SIGKILL); }
 
 int ChildProcess::wait() {

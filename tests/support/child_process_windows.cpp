@@ -83,6 +83,8 @@ bool ChildProcess::interrupt() {
 
 bool ChildProcess::terminate() { return interrupt(); }
 
+bool ChildProcess::hangUp() { return interrupt(); }
+
 void ChildProcess::kill() { TerminateProcess(state_->process.hProcess, kKilledExitCode); }
 
 int ChildProcess::wait() {
