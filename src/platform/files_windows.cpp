@@ -61,8 +61,10 @@ File File::open(const std::string& path, Mode mode, int& error) {
     const DWORD creation = reads                  ? OPEN_EXISTING
                            : mode == Mode::Append ? OPEN_ALWAYS
                                                   : CREATE_ALWAYS;
-    // Others may read, write, rename or delete, as on POSIX.
-    const DWORD share = FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE;
+    // Others may read and write, as on POSIX. A file being appended to (the results of a job) is
+    // kept from being deleted or renamed over: Windows would only mark it for deletion, and the
+    // job would write on into a file that vanishes when it closes.
+    const DWORD share = FILE_SHARE_READ | FILE_SHARE_WRITE | (append ? 0 : FILE_SHARE_DELETE);
     const HANDLE h =
         CreateFileW(wide.c_str(), access, share, nullptr, creation, FILE_ATTRIBUTE_NORMAL, nullptr);
     if (h == INVALID_HANDLE_VALUE) {
