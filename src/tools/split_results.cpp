@@ -21,7 +21,7 @@ namespace {
 constexpr std::size_t kMinimumBlockSize = 2;
 
 SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
-                        std::size_t blockSize) {
+                        const SplitOptions& options) {
     int err = 0;
     platform::File in = platform::File::open(resultsPath, platform::File::Mode::Read, err);
     if (err != 0) {
@@ -31,7 +31,7 @@ SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
     }
     if (copier.openFirst() != CopyStep::Go) return copier.finish(SplitStatus::Failed);
 
-    const std::size_t capacity = std::max(blockSize, kMinimumBlockSize);
+    const std::size_t capacity = std::max(options.blockSize, kMinimumBlockSize);
     std::vector<char> buffer(capacity);
     char* const data = buffer.data();
     std::size_t carry = 0;  // bytes of a record whose line end has not been read yet
@@ -47,6 +47,7 @@ SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
             return copier.finish(SplitStatus::Failed,
                                  fileReadFailure(resultsPath, systemReason(err)));
         }
+        if (options.progress) options.progress->bytesRead.fetch_add(got, std::memory_order_relaxed);
         if (got == 0) {
             if (carry > 0 || partial) {
                 const CopyStep s = copier.dropCutRecord(carry, partial);
@@ -94,7 +95,7 @@ SplitResult splitResultsFile(const std::string& resultsPath, const std::string& 
                              std::int64_t recordsPerFile, const StopSignal& stop,
                              const SplitOptions& options) {
     RecordCopier copier(namePrefix, std::max<std::int64_t>(recordsPerFile, 1), stop, options);
-    return copyRecords(resultsPath, copier, options.blockSize);
+    return copyRecords(resultsPath, copier, options);
 }
 
 std::string splitDoneMessage(std::int64_t files) {

@@ -1,5 +1,6 @@
 // tarn-cli split, run as the real program: what the command line adds to the split, its
 // arguments, exit codes and the streams its messages go to.
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <filesystem>
