@@ -16,8 +16,8 @@ void installInterruptHandler(StopSignal& stop) {
     struct sigaction action {};
     action.sa_handler = onSignal;
     sigemptyset(&action.sa_mask);
-    sigaction(SIGINT, &action, nullptr);
-    sigaction(SIGTERM, &action, nullptr);
+    // A closed terminal (SIGHUP) stops the job like Ctrl-C, so its checkpoint is written.
+    for (const int number : {SIGINT, SIGTERM, SIGHUP}) sigaction(number, &action, nullptr);
 }
 
 }  // namespace tarn::cli

@@ -31,6 +31,8 @@ int runSplit(const SplitArguments& args, Context& ctx) {
         std::cerr << r.message << '\n';
         return kIoFailure;
     }
+    const std::string input = resultsFilePath(ctx.folder);
+    if (r.cutBytes > 0) std::cerr << cutRecordNote(input, r.cutBytes) << '\n';
     writeStandardOutput(splitDoneMessage(r.files) + '\n');
     return r.status == SplitStatus::Stopped ? kStopped : kOk;
 }

@@ -19,6 +19,7 @@
 #include "core/file_names.hpp"
 #include "generation/chunk_producer.hpp"
 #include "generation/record_formatter.hpp"
+#include "generation/results_change.hpp"
 #include "generation/wheel_sieve.hpp"
 #include "generation/write_pipeline.hpp"
 
@@ -68,6 +69,7 @@ std::string failureMessage(const PipelineFailure& failure, const std::string& re
             return fileWriteFailure(resultsPath, systemReason(failure.error));
         case PipelineFailure::Kind::Checkpoint:
             return fileWriteFailure(checkpointPath, failure.reason);
+        case PipelineFailure::Kind::Changed:
         case PipelineFailure::Kind::Internal:
         case PipelineFailure::Kind::None:
             break;
@@ -107,6 +109,32 @@ JobResult recover(ResultsSink& sink, FileMark keep, FileMark durable, const JobS
     return result;
 }
 
+// The file at the path is not what the job wrote. Deleted or replaced, nothing there is the job's
+// to touch or to continue. Cut or grown, the whole records among the bytes the sink vouches for
+// are kept, and a resume continues after them.
+JobResult recoverChanged(ResultsSink& sink, FileCheck seen, const JobSpec& spec,
+                         const JobHooks& hooks, JobResult result) {
+    const std::uint64_t written = sink.size();
+    if (const FileCheck now = sink.check(); now.change != FileCheck::Change::None) seen = now;
+    result.status = JobResult::Status::Failed;
+    result.error = resultsChangeMessage(result.resultsPath, seen, written);
+    Checkpoint checkpoint{kFirstTurnStart, spec.limit, 0};
+    if (seen.change == FileCheck::Change::Resized) {
+        if (const auto kept = keptRecords(result.resultsPath, seen.trusted, spec.limit)) {
+            checkpoint = kept->checkpoint;
+            if (const int cut = sink.truncate(kept->bytes); cut != 0)
+                result.error.append(" ").append(
+                    fileWriteFailure(result.resultsPath, systemReason(cut)));
+        }
+    }
+    sink.close();
+    result.candidate = checkpoint.candidate;
+    const std::string checkpointPath = checkpointFilePath(spec.folder);
+    if (std::string reason = saveCheckpoint(hooks, checkpointPath, checkpoint); !reason.empty())
+        result.error.append(" ").append(fileWriteFailure(checkpointPath, reason));
+    return result;
+}
+
 JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress,
                         const JobHooks& hooks, JobResult& result) {
     const std::string checkpointPath = checkpointFilePath(spec.folder);
@@ -130,6 +158,16 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
         result.error = "There is not enough memory to generate the primes up to " +
                        std::to_string(spec.limit) + ".";
         return result;
+    }
+
+    // Before the file is emptied, a checkpoint with no job to continue: a kill from here on must
+    // not leave an old one describing records that are gone.
+    if (!spec.append) {
+        const Checkpoint fresh{kFirstTurnStart, spec.limit, 0};
+        if (std::string reason = saveCheckpoint(hooks, checkpointPath, fresh); !reason.empty()) {
+            result.error = fileWriteFailure(checkpointPath, reason);
+            return result;
+        }
     }
 
     int openError = 0;
@@ -181,6 +219,8 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
         written = pipeline.written();
         durable = pipeline.durable();
         if (pipeline.failed()) {
+            if (pipeline.failure().kind == PipelineFailure::Kind::Changed)
+                return recoverChanged(*sink, pipeline.failure().check, spec, hooks, result);
             const bool trusted = pipeline.failure().kind != PipelineFailure::Kind::Sync;
             return recover(*sink, trusted ? written : durable, durable, spec, hooks,
                            pipeline.failure(), result);
@@ -194,6 +234,9 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
         return recover(*sink, durable, durable, spec, hooks,
                        {PipelineFailure::Kind::Sync, error, {}}, result);
     }
+    if (const FileCheck check = sink->check();
+        check.change != FileCheck::Change::None || check.error != 0)
+        return recoverChanged(*sink, check, spec, hooks, result);
     // Past a good flush every record is on the disk, so the checkpoint may say so even when
     // closing reports an error.
     const int closing = sink->close();

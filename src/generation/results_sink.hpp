@@ -12,6 +12,15 @@
 
 namespace tarn {
 
+// Whether the file at the results path is still the one the job writes, with every byte of it.
+struct FileCheck {
+    enum class Change { None, Gone, Replaced, Resized };
+    Change change = Change::None;
+    std::uint64_t bytes = 0;    // Resized: the open file's size now
+    std::uint64_t trusted = 0;  // Resized: the bytes at its start that are surely the job's
+    int error = 0;              // the system's error number when the path could not be looked at
+};
+
 class ResultsSink {
 public:
     virtual ~ResultsSink() = default;
@@ -25,13 +34,18 @@ public:
     // Cuts the file back to `size` bytes (used to drop a torn record after a failed write).
     virtual int truncate(std::uint64_t size) = 0;
     virtual int close() = 0;
+    // Looks whether someone deleted, replaced or resized the file under the job; waits for a
+    // write in progress, so the size is compared with every byte written. The job looks after
+    // every write, so that little is written past a cut.
+    virtual FileCheck check() = 0;
     // The bytes in the file: those it held when opened, plus those written, as cut back.
     // Called by the writer only, or once the writer has finished.
     virtual std::uint64_t size() const = 0;
 };
 
-// Opens the results file for writing: truncated for a fresh job, positioned at its end for
-// `append`. Returns nothing and the error number on failure.
+// Opens the results file for appending, emptied first for a fresh job: a file cut under the job
+// then shows in its size instead of gaining a hole. Returns nothing and the error number on
+// failure.
 std::unique_ptr<ResultsSink> openResultsFile(const std::string& path, bool append, int& error);
 
 }  // namespace tarn

@@ -131,6 +131,11 @@ void WritePipeline::writeOne(RecordBuffer& b) {
             return;
         }
         if (hooks_.durable) sink_.startWriteback(offset, b.size);
+        if (const FileCheck check = sink_.check();
+            check.change != FileCheck::Change::None || check.error != 0) {
+            fail({PipelineFailure::Kind::Changed, check.error, {}, check});
+            return;
+        }
     }
     {
         std::lock_guard lock(mutex_);
@@ -172,6 +177,12 @@ bool WritePipeline::checkpointOnce(std::chrono::steady_clock::time_point& lastFl
     lastFlush = std::chrono::steady_clock::now();
     if (const int error = sink_.sync(); error != 0) {
         fail({PipelineFailure::Kind::Sync, error, {}});
+        return false;
+    }
+    // A checkpoint must not vouch for records that are no longer at the path.
+    if (const FileCheck check = sink_.check();
+        check.change != FileCheck::Change::None || check.error != 0) {
+        fail({PipelineFailure::Kind::Changed, check.error, {}, check});
         return false;
     }
     const Checkpoint checkpoint{mark.candidate, limit_, 1};

@@ -49,10 +49,11 @@ struct FileMark {
 
 // What went wrong first, for the failure path and its message.
 struct PipelineFailure {
-    enum class Kind { None, Write, Sync, Checkpoint, Internal };
+    enum class Kind { None, Write, Sync, Checkpoint, Changed, Internal };
     Kind kind = Kind::None;
     int error = 0;       // Write, Sync: the system's error number
     std::string reason;  // Checkpoint: the system's reason; Internal: what was thrown
+    FileCheck check{};   // Changed: what became of the file
 };
 
 // Rewrites the checkpoint through the job's hook, or for real.

@@ -6,8 +6,10 @@
 #include <fcntl.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
+#include <filesystem>
 #include <utility>
 
 #include "core/file_messages.hpp"
@@ -23,6 +25,7 @@ SplitOutputFile::~SplitOutputFile() {
 
 bool SplitOutputFile::open(std::string name) {
     name_ = std::move(name);
+    size_ = 0;
     errno = 0;
     fd_ = ::open(name_.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666);
     return fd_ >= 0 || fail(errno);
@@ -46,6 +49,14 @@ bool SplitOutputFile::close() {
     return ok;
 }
 
+bool SplitOutputFile::dropLast(std::uint64_t count) {
+    if (!flush()) return false;
+    std::error_code error;
+    size_ -= std::min(size_, count);
+    std::filesystem::resize_file(name_, size_, error);
+    return !error || fail(error.value());
+}
+
 bool SplitOutputFile::flush() {
     const std::size_t count = used_;
     used_ = 0;
@@ -64,6 +75,7 @@ bool SplitOutputFile::put(const char* bytes, std::size_t count) {
         if (done <= 0) return fail(done < 0 ? errno : 0);
         bytes += done;
         count -= static_cast<std::size_t>(done);
+        size_ += static_cast<std::uint64_t>(done);
     }
     return true;
 }

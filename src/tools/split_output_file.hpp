@@ -4,6 +4,7 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -25,6 +26,8 @@ public:
     // input's.
     bool write(const char* bytes, std::size_t count);
     bool close();
+    // Takes back the last `count` bytes written (a cut record whose start already went out).
+    bool dropLast(std::uint64_t count);
 
     // "The file <name> could not be written: <reason>."
     const std::string& error() const { return error_; }
@@ -40,6 +43,7 @@ private:
     std::string error_;
     std::vector<char> staging_;
     std::size_t used_ = 0;
+    std::uint64_t size_ = 0;  // bytes given to the system
 };
 
 }  // namespace tarn

@@ -101,22 +101,19 @@ CopyStep RecordCopier::copyLineByLine(const char* data, std::size_t end) {
 CopyStep RecordCopier::copyRecordPiece(const char* data, std::size_t count, bool continued) {
     if (!continued) {
         if (const CopyStep s = makeRoom(); s != CopyStep::Go) return s;
+        pieceBytes_ = 0;
     }
+    pieceBytes_ += count;
     return out_.write(data, count) ? CopyStep::Go : CopyStep::Fail;
 }
 
-CopyStep RecordCopier::copyLastFragment(const char* data, std::size_t count) {
-    if (const CopyStep s = makeRoom(); s != CopyStep::Go) return s;
-    if (!out_.write(data, count)) return CopyStep::Fail;
-    const bool endsInCr = count > 0 && data[count - 1] == '\r';
-    if (!out_.write(endsInCr ? "\n" : "\r\n", endsInCr ? 1 : 2)) return CopyStep::Fail;
-    ++inFile_;
-    ++copied_;
-    return CopyStep::Go;
+CopyStep RecordCopier::dropCutRecord(std::size_t count, bool continued) {
+    cutBytes_ = count + (continued ? pieceBytes_ : 0);
+    return !continued || out_.dropLast(pieceBytes_) ? CopyStep::Go : CopyStep::Fail;
 }
 
 SplitResult RecordCopier::finish(SplitStatus status, const std::string& failure) {
-    SplitResult r{status, files_, {}};
+    SplitResult r{status, files_, {}, cutBytes_};
     if (status == SplitStatus::Failed) {
         r.message = failure.empty() ? out_.error() : failure;
         out_.close();

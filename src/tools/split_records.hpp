@@ -36,9 +36,9 @@ public:
     // A piece of a record longer than the read buffer; `continued` when an earlier piece of the
     // same record already went out.
     CopyStep copyRecordPiece(const char* data, std::size_t count, bool continued);
-    // The rest of a record that the input ends without a line end: it gets one, like every
-    // other line of the output.
-    CopyStep copyLastFragment(const char* data, std::size_t count);
+    // The input ended inside a record: a cut record is no record, so what of it already went out
+    // (`continued`) is taken back. `count` bytes of it were still held.
+    CopyStep dropCutRecord(std::size_t count, bool continued);
 
     // Closes the current file and gives the result; `failure` is the message of a failure that
     // was not the output's own (a read that failed).
@@ -57,6 +57,8 @@ private:
     std::int64_t files_ = 0;
     std::int64_t inFile_ = 0;
     std::int64_t copied_ = 0;
+    std::uint64_t pieceBytes_ = 0;  // of a record longer than a block, already out
+    std::uint64_t cutBytes_ = 0;    // of a cut last record, left out
 };
 
 }  // namespace tarn

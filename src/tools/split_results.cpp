@@ -63,7 +63,7 @@ SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
         }
         if (got == 0) {
             if (carry > 0 || partial) {
-                const CopyStep s = copier.copyLastFragment(data, carry);
+                const CopyStep s = copier.dropCutRecord(carry, partial);
                 if (s != CopyStep::Go) return copier.finish(endStatus(s));
             }
             return copier.finish(SplitStatus::Completed);
@@ -113,6 +113,11 @@ SplitResult splitResultsFile(const std::string& resultsPath, const std::string& 
 
 std::string splitDoneMessage(std::int64_t files) {
     return "Done!!!" + signedText(Number::fromWhole(files)) + " files were created.";
+}
+
+std::string cutRecordNote(const std::string& resultsPath, std::uint64_t bytes) {
+    return "The last " + std::to_string(bytes) + " bytes of " + resultsPath +
+           " were left out: they end without CR LF, so they are part of a record cut short.";
 }
 
 }  // namespace tarn

@@ -35,8 +35,9 @@ enum class SplitStatus { Completed, Stopped, Failed };
 
 struct SplitResult {
     SplitStatus status = SplitStatus::Completed;
-    std::int64_t files = 0;  // output files opened, the first one always counting
-    std::string message;     // for Failed: the file and the system's reason
+    std::int64_t files = 0;      // output files opened, the first one always counting
+    std::string message;         // for Failed: the file and the system's reason
+    std::uint64_t cutBytes = 0;  // after the input's last line end: a cut record, left out
 };
 
 struct SplitOptions {
@@ -53,12 +54,15 @@ struct SplitOptions {
 // by splitFileName(namePrefix, n). A new file is opened only when a record is there for it,
 // so an evenly divided count leaves no empty last file; an empty results file gives one empty
 // first file. The stop is looked at between records only (at block and file boundaries), so
-// a stopped split leaves complete records, the last file holding those it had received.
+// a stopped split leaves complete records, the last file holding those it had received. Bytes
+// after the last line end are a record cut short (a killed job): they are left out and counted.
 SplitResult splitResultsFile(const std::string& resultsPath, const std::string& namePrefix,
                              std::int64_t recordsPerFile, const StopSignal& stop,
                              const SplitOptions& options = {});
 
 // "Done!!!", the signed text of the file count and " files were created.".
 std::string splitDoneMessage(std::int64_t files);
+// Says that the bytes after the last line end of the results file were left out.
+std::string cutRecordNote(const std::string& resultsPath, std::uint64_t bytes);
 
 }  // namespace tarn

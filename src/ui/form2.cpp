@@ -123,6 +123,10 @@ void Form2::splitEnded() {
     ui_->Command2->setText(QStringLiteral("Close"));
     if (result.status == SplitStatus::Failed)
         messages_.show(result.message, "Info");
+    else if (result.cutBytes > 0)
+        messages_.show(splitDoneMessage(result.files) + ' ' +
+                           cutRecordNote(resultsFilePath(programFolder_), result.cutBytes),
+                       "Info");
     else
         messages_.show(splitDoneMessage(result.files), "Info");
     Q_EMIT splitFinished();

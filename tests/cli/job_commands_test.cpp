@@ -73,7 +73,7 @@ TEST(JobCommands, WriteFailureExitsWithOne) {
         << run.err;
 }
 
-// SIGTERM during a long job: it leaves through its stop path.
+// SIGTERM, or SIGHUP from a closed terminal, during a long job: it leaves through its stop path.
 TEST(JobCommands, TerminationStopsTheJobWithExitCodeThree) {
     for (const bool resume : {false, true}) {
         const Cli cli;
@@ -85,7 +85,7 @@ TEST(JobCommands, TerminationStopsTheJobWithExitCodeThree) {
                        cli.output.path());
         // The signal comes once the job is writing records, however slowly the program starts.
         waitForGrowth(cli.results(), before + 100'000);
-        child.signal(SIGTERM);
+        child.signal(resume ? SIGHUP : SIGTERM);
         EXPECT_EQ(child.wait(), 3) << child.err();
         EXPECT_EQ(child.err(), (resume ? kResumeNotes : "") + "All calculations were stopped!\n");
         EXPECT_EQ(child.out(), "");

@@ -42,6 +42,12 @@ TEST_F(SplitCommand, ExitCodesAndStreams) {
     EXPECT_FALSE(std::filesystem::exists(file(1)));
     EXPECT_EQ(split("1000.9"), (CliRun{0, "Done!!! 3 files were created.\n", ""}));
     EXPECT_EQ(readFile(file(1)) + readFile(file(2)) + readFile(file(3)), records(2500));
+    writeFile(data.path() + "primes.txt", records(2500) + "2501;25");  // a record cut short
+    EXPECT_EQ(split("1000"), (CliRun{0, "Done!!! 3 files were created.\n",
+                                     "The last 7 bytes of " + data.path() +
+                                         "primes.txt were left out: they end without CR LF, so "
+                                         "they are part of a record cut short.\n"}));
+    EXPECT_EQ(readFile(file(1)) + readFile(file(2)) + readFile(file(3)), records(2500));
 }
 
 TEST_F(SplitCommand, CtrlCStopsBetweenRecordsWithExitCodeThree) {

@@ -206,13 +206,14 @@ TEST(GenerationJobFailure, FailuresNameTheFileAndLeaveAContinuableCheckpoint) {
     {
         TempFolder folder;
         const std::string missing = folder.path() + "gone/";
-        EXPECT_EQ(failIn(missing, 1000).error,
-                  "The file " + missing +
-                      "primes.txt could not be opened for writing: No such file or directory.");
+        // The checkpoint goes first, before the results file is emptied.
+        EXPECT_EQ(
+            failIn(missing, 1000).error,
+            "The file " + missing + "primes.ini could not be written: No such file or directory.");
         EXPECT_FALSE(std::filesystem::exists(missing));
     }
-    // A folder in the way of the checkpoint's temporary file fails the real rewrite at the end
-    // (injected checkpoint faults during the job have a table of their own).
+    // A folder in the way of the checkpoint's temporary file fails the real rewrite (injected
+    // checkpoint faults have a table of their own).
     TempFolder folder;
     std::filesystem::create_directory(folder.path() + "primes.ini.tmp");
     JobHooks atTheEnd;

@@ -1,15 +1,18 @@
 // Nothing lost, cut or reordered, whatever fails: a fresh job and a resume each meet one injected
 // fault (a results write that fills the disk at a byte offset, a flush or a checkpoint rewrite
 // that fails once or from then on, an exception on a sieving thread, the writer or the
-// checkpointer), must report it, must leave every record they had on the disk and a file of whole
-// records in order, and a resume on a working disk must then finish the file of one uninterrupted
-// job, byte for byte.
+// checkpointer, a kill as the results file is opened, the file deleted, replaced or cut under
+// the job), must report it, must leave every record they had on the disk (that the user did not
+// remove) and a file of whole records in order that the checkpoint describes, and a resume on a
+// working disk must then finish the file of one uninterrupted job, byte for byte. A fresh job
+// starts over the finished file of an earlier one.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <atomic>
 #include <cerrno>
 #include <cstdio>
+#include <filesystem>
 #include <stdexcept>
 #include <thread>
 
@@ -35,6 +38,10 @@ struct Fault {
         ThrowInWriter,      // the writer meets an exception at byte `at`
         ThrowInProducer,    // the sieving thread meets one after batch `at`
         ThrowInCheckpoint,  // the checkpointer meets one at its at-th rewrite
+        Kill,               // killed as it opens the results file: the files as they are then
+        Delete,             // after the at-th checkpoint during the job, the results file is
+        Replace,            // deleted, replaced by a copy of its durable records,
+        Truncate,           // or cut inside its last durable record
     };
     Kind kind;
     std::uint64_t at;
@@ -47,7 +54,11 @@ std::string describe(const Fault& f) {
                                   "checkpoint",
                                   "throw in writer",
                                   "throw in producer",
-                                  "throw in checkpoint"};
+                                  "throw in checkpoint",
+                                  "kill",
+                                  "delete",
+                                  "replace",
+                                  "truncate"};
     return std::string(names[static_cast<int>(f.kind)]) + " at " + std::to_string(f.at) +
            (f.persistent ? " from then on" : "");
 }
@@ -55,8 +66,9 @@ std::string describe(const Fault& f) {
 // Counts the calls of one run and fails the one the fault names.
 struct Injector {
     Fault fault;
-    std::atomic<std::uint64_t> written{0}, syncs{0}, checkpoints{0};
+    std::atomic<std::uint64_t> written{0}, syncs{0}, checkpoints{0}, changes{0};
     std::atomic<bool> fired{false};
+    std::string path, killedResults, killedCheckpoint;
 
     bool hits(Fault::Kind kind, std::uint64_t count) {
         const bool hit =
@@ -91,6 +103,7 @@ public:
         return injector_.hits(Fault::Kind::Sync, ++injector_.syncs) ? EIO : file_->sync();
     }
     int truncate(std::uint64_t size) override { return file_->truncate(size); }
+    FileCheck check() override { return file_->check(); }
     int close() override { return file_->close(); }
     std::uint64_t size() const override { return file_->size(); }
 
@@ -106,6 +119,11 @@ JobHooks faultyHooks(Injector& injector) {
     hooks.checkpointInterval = 0ms;
     hooks.openResults = [&injector](const std::string& path, bool append, int& error) {
         auto file = openResultsFile(path, append, error);
+        injector.path = path;
+        if (injector.hits(Fault::Kind::Kill, 0)) {
+            injector.killedResults = readFile(path);
+            injector.killedCheckpoint = readFile(path.substr(0, path.size() - 3) + "ini");
+        }
         return file ? std::make_unique<FaultySink>(std::move(file), injector) : nullptr;
     };
     hooks.writeCheckpoint = [&injector](const std::string& path, const Checkpoint& c) {
@@ -114,6 +132,15 @@ JobHooks faultyHooks(Injector& injector) {
             throw std::runtime_error("injected");
         if (injector.hits(Fault::Kind::Checkpoint, count)) return systemReason(EIO);
         return writeCheckpoint(path, c);
+    };
+    hooks.afterCheckpoint = [&injector](const Checkpoint&, std::uint64_t durableBytes) {
+        const Fault::Kind kind = injector.fault.kind;
+        if (kind < Fault::Kind::Delete || !injector.hits(kind, ++injector.changes)) return;
+        if (kind == Fault::Kind::Truncate)
+            return std::filesystem::resize_file(injector.path, durableBytes - 3);
+        const std::string records = readFile(injector.path).substr(0, durableBytes);
+        std::filesystem::remove(injector.path);
+        if (kind == Fault::Kind::Replace) writeFile(injector.path, records);
     };
     // Holds the sieving back until the checkpointer has flushed a few times, so that the
     // faults of the first flushes land inside the run whatever the machine's speed.
@@ -140,6 +167,18 @@ std::string expectedMessage(const Fault& f, const std::string& folder) {
         case Fault::Kind::Checkpoint:
             return "The file " + folder + "primes.ini could not be written: " + systemReason(EIO) +
                    ".";
+        case Fault::Kind::Kill:
+            return "";
+        case Fault::Kind::Delete:
+            return "The file " + folder +
+                   "primes.txt was deleted while the job was writing it. The job stopped; "
+                   "generate the primes again.";
+        case Fault::Kind::Replace:
+            return "The file " + folder +
+                   "primes.txt was replaced by another file while the job was writing it. The "
+                   "job stopped; generate the primes again.";
+        case Fault::Kind::Truncate:  // then the sizes, and what was kept
+            return "The file " + folder + "primes.txt holds ";
         default:
             return "The job stopped on an unexpected error: injected.";
     }
@@ -167,6 +206,7 @@ void runWithFault(const Fault& fault, bool enumerated, std::int64_t stopAfter,
     TempFolder folder;
     const std::string full = oracleResults(kLimit, enumerated);
     std::int64_t kept = 0;  // candidate up to which records were on the disk before the run
+    if (stopAfter == 0) runJob({folder.path(), 1000, enumerated}, StopSignal{}, nullptr);
     if (stopAfter > 0) {
         StopSignal stop;
         JobHooks hooks;
@@ -179,7 +219,8 @@ void runWithFault(const Fault& fault, bool enumerated, std::int64_t stopAfter,
         kept = r.candidate;
     }
 
-    Injector injector{fault};
+    Injector injector;
+    injector.fault = fault;
     const JobHooks hooks = faultyHooks(injector);
     std::string message;
     if (stopAfter > 0) {
@@ -191,14 +232,28 @@ void runWithFault(const Fault& fault, bool enumerated, std::int64_t stopAfter,
         message = r.status == JobResult::Status::Failed ? r.error : "";
     }
     if (!injector.fired) missed += describe(fault) + "; ";
+    if (fault.kind == Fault::Kind::Kill) {
+        writeFile(folder.path() + "primes.txt", injector.killedResults);
+        writeFile(folder.path() + "primes.ini", injector.killedCheckpoint);
+    }
     if (injector.fired) {
-        EXPECT_EQ(message, expectedMessage(fault, folder.path()));
+        if (fault.kind == Fault::Kind::Truncate)
+            EXPECT_THAT(message, testing::StartsWith(expectedMessage(fault, folder.path())));
+        else
+            EXPECT_EQ(message, expectedMessage(fault, folder.path()));
         // Whole records in order, and nothing that was on the disk before the run is gone.
         const std::string file = readFile(folder.path() + "primes.txt");
         EXPECT_TRUE(full.starts_with(file)) << file.size() << " bytes";
         EXPECT_TRUE(file.ends_with("\r\n") || file.empty());
         const std::int64_t point = resumePoint(folder.path());
-        EXPECT_GE(point, kept);
+        if (fault.kind < Fault::Kind::Delete) {
+            EXPECT_GE(point, kept);
+        }
+        // A finished checkpoint names a whole file.
+        if (const auto c = readCheckpoint(folder.path() + "primes.ini").checkpoint;
+            c && c->interrupted == 0 && c->candidate > c->limit) {
+            EXPECT_TRUE(sameText(file, oracleResults(c->limit, enumerated)));
+        }
         EXPECT_TRUE(file.starts_with(oracleResults(point, enumerated))) << "checkpoint " << point;
     }
 
@@ -233,7 +288,9 @@ std::vector<Fault> faultTable() {
     for (const std::uint64_t at : {1, 3}) {
         faults.push_back({K::ThrowInProducer, at});
         faults.push_back({K::ThrowInCheckpoint, at});
+        for (const K change : {K::Delete, K::Replace, K::Truncate}) faults.push_back({change, at});
     }
+    faults.push_back({K::Kill, 0});
     return faults;
 }
 

@@ -32,13 +32,13 @@ std::string resultsText(std::int64_t count, bool enumerated, const std::string& 
     return text;
 }
 
-// What the split must write: the input's lines (ended by LF, CR LF or the end of the text),
-// each ended by CR LF, in groups of perFile.
+// What the split must write: the input's lines (ended by LF or CR LF), each ended by CR LF, in
+// groups of perFile. Bytes after the last line end are a record cut short, and left out.
 std::vector<std::string> naiveSplit(const std::string& input, std::size_t perFile) {
     std::vector<std::string> files(1);
     std::size_t inFile = 0;
-    for (std::size_t start = 0; start < input.size();) {
-        const std::size_t lf = std::min(input.find('\n', start), input.size());
+    for (std::size_t start = 0; input.find('\n', start) != std::string::npos;) {
+        const std::size_t lf = input.find('\n', start);
         std::string line = input.substr(start, lf - start);
         if (!line.empty() && line.back() == '\r') line.pop_back();
         if (inFile == perFile) files.emplace_back(), inFile = 0;
@@ -91,6 +91,7 @@ struct SplitFixture : ::testing::Test {
                          const SplitOptions& options) {
         const SplitResult r = split(input, perFile, options);
         ASSERT_EQ(r.status, SplitStatus::Completed) << r.message;
+        EXPECT_EQ(r.cutBytes, input.size() - (input.rfind('\n') + 1));  // npos + 1 is 0
         const std::string expected = crlfLines(input);
         const std::int64_t records = lineEnds(expected);
         ASSERT_EQ(r.files, std::max<std::int64_t>(1, (records + perFile - 1) / perFile));
@@ -122,7 +123,7 @@ TEST_F(SplitFixture, FilesJoinBackToTheInputWhateverTheCountAndTheChunking) {
     struct Kind {
         const char* name;
         bool enumerated;
-        bool crlf;  // else bare LF line ends and no line end after the last record
+        bool crlf;  // else bare LF line ends and a last record cut short
     };
     // How much of the input one read asks for, and how much the system takes per write (0:
     // the system's own). Reads and writes of a few bytes cost a system call each, so they
@@ -173,14 +174,15 @@ TEST_F(SplitFixture, FilesJoinBackToTheInputWhateverTheCountAndTheChunking) {
 
 TEST_F(SplitFixture, OddLinesAreMendedWhateverTheBlockSize) {
     // Mixed line ends, an empty line, records longer than small blocks and one longer than a
-    // large block that follows staged records; a last line without its line end or with a
-    // lone CR; an empty input gives one empty file.
+    // large block that follows staged records; a last record cut short, also with a lone CR or
+    // longer than a block; an empty input gives one empty file.
     std::string mixed = resultsText(2000, false);
     for (int i = 0; i < 1500; ++i) mixed += std::to_string(i) + (i % 3 ? "\n" : "\r\n");
     mixed.append("\n").append(50, '7').append("\r\n").append(40, '9').append("\n123");
     std::string longRecord = "5\n7\r\n";
     longRecord.append(100000, '3').append("\r\n11\r\n");
-    for (const std::string& input : {mixed, mixed + "\r", longRecord, std::string()})
+    for (const std::string& input :
+         {mixed, mixed + "\r", longRecord, longRecord + std::string(9000, '7'), std::string()})
         for (std::size_t block : {2u, 3u, 5u, 16u, 33u, 4099u, 40009u}) {
             SCOPED_TRACE("block " + std::to_string(block));
             expectJoinsBack(input, 1000, {block, {}, {}});
