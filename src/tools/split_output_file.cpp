@@ -57,6 +57,14 @@ bool SplitOutputFile::dropLast(std::uint64_t count) {
     return !error || fail(error.value());
 }
 
+bool SplitOutputFile::discard() {
+    used_ = 0;
+    if (!close()) return false;
+    std::error_code error;
+    std::filesystem::remove(name_, error);
+    return !error || fail(error.value());
+}
+
 bool SplitOutputFile::flush() {
     const std::size_t count = used_;
     used_ = 0;
