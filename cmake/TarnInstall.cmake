@@ -1,5 +1,6 @@
-# Installation: the GNU layout (bin/, share/doc/tarn/, share/applications/, share/icons/hicolor/,
-# share/metainfo/) for `cmake --install`, and a Debian package from `cpack -G DEB`.
+# Installation: the GNU layout (bin/, share/doc/tarn/, share/man/man1/, share/applications/,
+# share/icons/hicolor/, share/metainfo/, share/bash-completion/) for `cmake --install`, and a
+# Debian package from `cpack -G DEB`.
 # The programs find their read-me and tell an installed copy from a portable one by paths
 # relative to their own folder, so a prefix moved after installation still works.
 
@@ -19,6 +20,9 @@ set_property(SOURCE src/core/data_folder.cpp APPEND PROPERTY COMPILE_DEFINITIONS
 
 install(TARGETS tarn-cli RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
 install(FILES README.md DESTINATION ${CMAKE_INSTALL_DOCDIR} RENAME README.txt)
+# Where bash-completion looks for a command's completion when it is first used.
+install(FILES data/tarn-cli.bash-completion
+    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME tarn-cli)
 
 set(TARN_APP_ID example.brindle.tarn)
 if(TARGET tarn)
@@ -32,10 +36,16 @@ endif()
 set(CPACK_PACKAGE_NAME tarn)
 set(CPACK_PACKAGE_VENDOR Brindle)
 set(CPACK_PACKAGE_CONTACT "Brindle <tarn@brindle.example>")
-set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "Generate, test and factorize prime numbers")
-set(CPACK_PACKAGE_DESCRIPTION "Tarn generates every prime up to a limit into a text file, \
-resumes a stopped job, tests and factorizes numbers and splits the results file. \
-The command-line program tarn-cli does the same from a terminal.")
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "generate, test, factorize and split prime numbers")
+# The extended description as the control file shows it, below the summary: lines of at most
+# 80 characters, "." for an empty one.
+set(CPACK_PACKAGE_DESCRIPTION [[
+Tarn is a desktop tool for prime numbers. It generates every prime up to a
+limit into a text file, stops a long job and resumes it later (also after
+a crash), tests one number for primality, factorizes one number into prime
+powers and splits the results file into smaller files.
+.
+The command-line program tarn-cli does the same from a terminal or a script.]])
 set(CPACK_PACKAGE_HOMEPAGE_URL "https://brindle.example")
 set(CPACK_STRIP_FILES ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
@@ -45,4 +55,7 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 if(NOT WIN32)
     set(CPACK_GENERATOR DEB)
 endif()
+
+include(cmake/TarnPackageDocs.cmake)
+include(cmake/TarnManPages.cmake)
 include(CPack)

@@ -1,6 +1,8 @@
 // tarn: the desktop program.
 #include <QApplication>
 #include <QSessionManager>
+#include <cstdio>
+#include <cstring>
 
 #include "core/app_folder.hpp"
 #include "core/data_folder.hpp"
@@ -9,7 +11,35 @@
 #include "ui/shell/desktop_shell.hpp"
 #include "ui/termination_signals.hpp"
 
+namespace {
+
+constexpr char kHelp[] =
+    "Tarn: generate, test, factorize and split prime numbers in a window.\n"
+    "Usage: tarn [OPTIONS]\n"
+    "\n"
+    "Options:\n"
+    "  -h,--help                   Print this help message and exit\n"
+    "  --version                   Display program version information and exit\n"
+    "\n"
+    "Qt's own options (such as -platform NAME or -style NAME) are taken as well.\n";
+
+// --help and --version answer before the window system is reached, so that they also work
+// without a display.
+bool answeredInformationOption(int argc, char** argv, int& code) {
+    for (int i = 1; i < argc; ++i) {
+        const bool help = std::strcmp(argv[i], "--help") == 0 || std::strcmp(argv[i], "-h") == 0;
+        if (!help && std::strcmp(argv[i], "--version") != 0) continue;
+        std::fputs(help ? kHelp : "tarn " TARN_VERSION "\n", stdout);
+        code = std::fflush(stdout) == 0 ? 0 : 1;
+        return true;
+    }
+    return false;
+}
+
+}  // namespace
+
 int main(int argc, char** argv) {
+    if (int code = 0; answeredInformationOption(argc, argv, code)) return code;
     QApplication app(argc, argv);
     QApplication::setApplicationName("Tarn");
     QApplication::setApplicationVersion(TARN_VERSION);

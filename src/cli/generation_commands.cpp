@@ -6,6 +6,7 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/job_report.hpp"
+#include "cli/progress_line.hpp"
 #include "core/entry.hpp"
 #include "generation/generation_job.hpp"
 #include "generation/job_texts.hpp"
@@ -57,7 +58,7 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
         ctx.stop.clear();
         JobResult result;
         {
-            ProgressLine line(progress, 11, spec.limit);
+            ProgressLine line(jobSample(progress, 11, spec.limit));
             result = runJob(spec, ctx.stop, &progress, hooks);
         }
         ctx.exitCode = reportJob(result);

@@ -1,12 +1,6 @@
-// What the job commands of tarn-cli share: the progress line on a terminal and the report
-// of a job's outcome with its exit code.
+// What the job commands of tarn-cli share: the report of a job's outcome with its exit code,
+// and their options.
 #pragma once
-
-#include <chrono>
-#include <condition_variable>
-#include <cstdint>
-#include <mutex>
-#include <thread>
 
 #include "generation/generation_job.hpp"
 
@@ -15,24 +9,6 @@ class App;
 }
 
 namespace tarn::cli {
-
-// A progress line on the terminal's error stream, a few times a second, while a job runs.
-class ProgressLine {
-public:
-    ProgressLine(const JobProgress& progress, std::int64_t from, std::int64_t limit);
-    ~ProgressLine();
-
-private:
-    void run();
-
-    const JobProgress& progress_;
-    const std::int64_t from_;
-    const std::int64_t limit_;
-    std::mutex mutex_;
-    std::condition_variable wake_;
-    bool done_ = false;
-    std::thread thread_;
-};
 
 // Prints the outcome of a job (report on stdout, stop notice or failure on stderr) and turns
 // it into the exit code.

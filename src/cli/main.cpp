@@ -18,6 +18,8 @@ int run(int argc, char** argv) {
 
     CLI::App app{"Tarn: generate, test, factorize and split prime numbers.", "tarn-cli"};
     app.set_version_flag("--version", std::string("tarn-cli ") + TARN_VERSION);
+    // Also the source of the manual page, which lists every subcommand with its options.
+    app.set_help_all_flag("--help-all", "Print the help of every subcommand and exit");
     app.require_subcommand(0, 1);
     std::string folder;
     app.add_option("--folder", folder,

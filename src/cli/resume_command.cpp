@@ -8,6 +8,7 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/job_report.hpp"
+#include "cli/progress_line.hpp"
 #include "generation/resume_job.hpp"
 #include "generation/resume_texts.hpp"
 
@@ -29,7 +30,7 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
         events.onGathering = [] { std::cerr << kGatheringInfoLine << '\n'; };
         events.onContinuing = [&](const ResumeStart& start) {
             std::cerr << kDoingResumeInfoLine << '\n';
-            line.emplace(progress, start.resumePoint, start.limit);
+            line.emplace(jobSample(progress, start.resumePoint, start.limit));
         };
         const ResumeResult result =
             runResume(ctx.folder, ctx.stop, &progress, events, *hooks, *threads);

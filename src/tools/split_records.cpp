@@ -49,6 +49,7 @@ CopyStep RecordCopier::openNext() {
     if (files_ > 0 && !out_.close()) return CopyStep::Fail;
     ++files_;
     inFile_ = 0;
+    if (options_.progress) options_.progress->files.store(files_, std::memory_order_relaxed);
     return out_.open(splitFileName(prefix_, files_)) ? CopyStep::Go : CopyStep::Fail;
 }
 

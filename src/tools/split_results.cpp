@@ -34,7 +34,7 @@ struct InputFile {
 };
 
 SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
-                        std::size_t blockSize) {
+                        const SplitOptions& options) {
     errno = 0;
     const InputFile in(::open(resultsPath.c_str(), O_RDONLY | O_CLOEXEC));
     if (in.fd < 0) {
@@ -45,7 +45,7 @@ SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
     }
     if (copier.openFirst() != CopyStep::Go) return copier.finish(SplitStatus::Failed);
 
-    const std::size_t capacity = std::max(blockSize, kMinimumBlockSize);
+    const std::size_t capacity = std::max(options.blockSize, kMinimumBlockSize);
     std::vector<char> buffer(capacity);
     char* const data = buffer.data();
     std::size_t carry = 0;  // bytes of a record whose line end has not been read yet
@@ -61,6 +61,7 @@ SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
             return copier.finish(SplitStatus::Failed,
                                  fileReadFailure(resultsPath, systemReason(errno)));
         }
+        if (options.progress) options.progress->bytesRead.fetch_add(got, std::memory_order_relaxed);
         if (got == 0) {
             if (carry > 0 || partial) {
                 const CopyStep s = copier.dropCutRecord(carry, partial);
@@ -108,7 +109,7 @@ SplitResult splitResultsFile(const std::string& resultsPath, const std::string& 
                              std::int64_t recordsPerFile, const StopSignal& stop,
                              const SplitOptions& options) {
     RecordCopier copier(namePrefix, std::max<std::int64_t>(recordsPerFile, 1), stop, options);
-    return copyRecords(resultsPath, copier, options.blockSize);
+    return copyRecords(resultsPath, copier, options);
 }
 
 std::string splitDoneMessage(std::int64_t files) {

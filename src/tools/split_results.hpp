@@ -4,6 +4,7 @@
 // of records to the system in single writes, so memory stays constant whatever the file size.
 #pragma once
 
+#include <atomic>
 #include <cstddef>
 #include <cstdint>
 #include <functional>
@@ -40,6 +41,12 @@ struct SplitResult {
     std::uint64_t cutBytes = 0;  // after the input's last line end: a cut record, left out
 };
 
+// What a running split has done so far, read by a progress display on another thread.
+struct SplitProgress {
+    std::atomic<std::int64_t> bytesRead{0};  // of the results file
+    std::atomic<std::int64_t> files{0};      // output files opened
+};
+
 struct SplitOptions {
     std::size_t blockSize = kSplitBlockSize;  // bytes read at once; small values only in tests
     // Called at every point where the split looks at the stop signal, with the number of
@@ -48,6 +55,7 @@ struct SplitOptions {
     // Takes the place of the system's write for the output files (empty: the system's own);
     // lets tests take a few bytes at a time or fail at a chosen byte.
     SplitWriteFunction writeSome;
+    SplitProgress* progress = nullptr;  // kept up to date when given
 };
 
 // Copies every record of resultsPath unchanged, each line ended by CR LF, into files named

@@ -1,6 +1,8 @@
 // tarn-cli split, run as the real program: what the command line adds to the split, its
 // arguments, exit codes and the streams its messages go to.
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <pty.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -77,4 +79,36 @@ TEST_F(SplitCommand, CtrlCStopsBetweenRecordsWithExitCodeThree) {
     const std::string printed = child.out();
     EXPECT_TRUE(printed.starts_with("Done!!! ") && printed.ends_with(" files were created.\n"))
         << printed;
+}
+
+TEST_F(SplitCommand, ShowsProgressOnATerminal) {
+    // Fed through a pipe, the split runs long enough for a progress line; a pipe has no size, so
+    // the share and the time left stay unknown. Off a terminal nothing is shown (see above).
+    const std::string results = data.path() + "primes.txt";
+    ASSERT_EQ(mkfifo(results.c_str(), 0600), 0);
+    int terminal = -1;
+    const pid_t pid = forkpty(&terminal, nullptr, nullptr, nullptr);
+    ASSERT_GE(pid, 0);
+    if (pid == 0) {
+        execl(TARN_CLI_PATH, TARN_CLI_PATH, "--folder", data.path().c_str(), "split", "--records",
+              "1000", "--into", into.path().c_str(), nullptr);
+        _exit(127);
+    }
+    std::FILE* feed = std::fopen(results.c_str(), "w");
+    ASSERT_TRUE(feed);
+    std::fputs(records(1500).c_str(), feed);
+    std::fflush(feed);
+    usleep(700000);
+    std::fclose(feed);
+    std::string shown;
+    char buffer[256];
+    for (ssize_t got; (got = read(terminal, buffer, sizeof buffer)) > 0;) shown.append(buffer, got);
+    close(terminal);
+    int status = 0;
+    waitpid(pid, &status, 0);
+    EXPECT_EQ(status, 0);
+    EXPECT_THAT(shown, ::testing::StartsWith("\r\x1b[K"));
+    EXPECT_THAT(shown, ::testing::ContainsRegex(
+                           R"(  0\.0%  [12] files?  0:00:0[0-9] elapsed  -:--:-- left)"));
+    EXPECT_THAT(shown, ::testing::EndsWith("\r\x1b[KDone!!! 2 files were created.\r\n"));
 }
