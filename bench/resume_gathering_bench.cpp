@@ -4,9 +4,7 @@
 // MB_per_s of the full check; MB_per_cpu_s, the same over the thread's CPU time (steadier on a busy
 // machine); read_MB_per_s, the floor set by the same file read with no check at all.
 #include <benchmark/benchmark.h>
-#include <fcntl.h>
 #include <time.h>
-#include <unistd.h>
 
 #include <chrono>
 #include <cstdio>
@@ -18,6 +16,7 @@
 #include "core/file_names.hpp"
 #include "generation/generation_job.hpp"
 #include "generation/results_scan.hpp"
+#include "platform/files.hpp"
 
 namespace {
 
@@ -30,11 +29,12 @@ double threadCpuSeconds() {
 // Reads the whole file in blocks of the scan's size and does nothing with the bytes.
 std::uint64_t readAll(const std::string& path,
                       std::size_t blockBytes = tarn::kResultsScanBlockBytes) {
-    const int fd = ::open(path.c_str(), O_RDONLY);
+    int error = 0;
+    tarn::platform::File file =
+        tarn::platform::File::open(path, tarn::platform::File::Mode::Read, error);
     const auto block = std::make_unique<char[]>(blockBytes);
     std::uint64_t total = 0;
-    for (ssize_t got; (got = ::read(fd, block.get(), blockBytes)) > 0;) total += got;
-    ::close(fd);
+    for (std::ptrdiff_t got; (got = file.read(block.get(), blockBytes, error)) > 0;) total += got;
     return total;
 }
 

@@ -18,14 +18,22 @@ file(RELATIVE_PATH TARN_DATAROOT_FROM_BIN
 set_property(SOURCE src/core/data_folder.cpp APPEND PROPERTY COMPILE_DEFINITIONS
     TARN_DOC_FROM_BIN="${TARN_DOC_FROM_BIN}" TARN_DATAROOT_FROM_BIN="${TARN_DATAROOT_FROM_BIN}")
 
-install(TARGETS tarn-cli RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
-install(FILES README.md DESTINATION ${CMAKE_INSTALL_DOCDIR} RENAME README.txt)
-# Where bash-completion looks for a command's completion when it is first used.
-install(FILES data/tarn-cli.bash-completion
-    DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME tarn-cli)
+if(WIN32)
+    # A portable copy: the programs and README.txt side by side, the files kept beside them.
+    install(TARGETS tarn-cli RUNTIME DESTINATION .)
+    install(FILES README.md DESTINATION . RENAME README.txt)
+else()
+    install(TARGETS tarn-cli RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+    install(FILES README.md DESTINATION ${CMAKE_INSTALL_DOCDIR} RENAME README.txt)
+    # Where bash-completion looks for a command's completion when it is first used.
+    install(FILES data/tarn-cli.bash-completion
+        DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME tarn-cli)
+endif()
 
 set(TARN_APP_ID example.brindle.tarn)
-if(TARGET tarn)
+if(TARGET tarn AND WIN32)
+    install(TARGETS tarn RUNTIME DESTINATION .)
+elseif(TARGET tarn)
     install(TARGETS tarn RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
     install(FILES data/tarn.desktop DESTINATION ${CMAKE_INSTALL_DATADIR}/applications)
     install(FILES data/${TARN_APP_ID}.metainfo.xml DESTINATION ${CMAKE_INSTALL_DATADIR}/metainfo)
@@ -52,7 +60,11 @@ set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_SECTION math)
 # Depends: from the libraries the programs link (Qt 6, GLib, the C++ runtime).
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
-if(NOT WIN32)
+if(WIN32)
+    # `cpack -G ZIP`: tarn-cli-<version>-win64.zip.
+    set(CPACK_GENERATOR ZIP)
+    set(CPACK_PACKAGE_FILE_NAME tarn-cli-${PROJECT_VERSION}-win64)
+else()
     set(CPACK_GENERATOR DEB)
 endif()
 

@@ -2,6 +2,12 @@
 # machine-readable copyright file, made from LICENSE, and CHANGELOG.md as a Debian changelog,
 # compressed the way Debian Policy asks (gzip -9n, no name or time stamp inside).
 
+# The Windows zip carries the licence as it stands, beside the program and its read-me.
+if(WIN32)
+    install(FILES LICENSE DESTINATION . RENAME LICENSE.txt)
+    return()
+endif()
+
 # LICENSE: a title, the copyright line, then the licence's text.
 file(READ LICENSE license)
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS LICENSE)
@@ -15,9 +21,6 @@ string(REGEX REPLACE "\n \n" "\n .\n" TARN_LICENSE_TEXT "${TARN_LICENSE_TEXT}")
 configure_file(data/copyright.in copyright @ONLY)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/copyright DESTINATION ${CMAKE_INSTALL_DOCDIR})
 
-if(WIN32)
-    return()
-endif()
 find_program(TARN_GZIP gzip REQUIRED)
 set(changelog ${CMAKE_CURRENT_BINARY_DIR}/changelog)
 add_custom_command(OUTPUT ${changelog}.gz

@@ -1,5 +1,5 @@
 // What every subcommand of tarn-cli shares: the folder of the results and checkpoint files,
-// the stop request raised by Ctrl-C, SIGTERM or SIGHUP, and the exit code the command leaves.
+// the stop request raised by Ctrl-C or termination, and the exit code the command leaves.
 #pragma once
 
 #include <optional>
@@ -34,7 +34,7 @@ void registerResumeCommand(CLI::App& app, Context& ctx);
 // that cannot be locked at all is left to the command, which reports its own file errors.
 std::optional<FolderLock> lockFolder(Context& ctx);
 
-// Raises `stop` on SIGINT, SIGTERM and SIGHUP.
+// Raises `stop` on Ctrl-C, termination and hang-up (on Windows: the console closing).
 void installInterruptHandler(StopSignal& stop);
 
 }  // namespace tarn::cli

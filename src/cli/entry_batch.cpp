@@ -1,7 +1,5 @@
 #include "cli/entry_batch.hpp"
 
-#include <unistd.h>
-
 #include <cerrno>
 #include <cstdio>
 #include <string_view>
@@ -9,6 +7,7 @@
 #include "cli/input_lines.hpp"
 #include "cli/standard_output.hpp"
 #include "core/entry.hpp"
+#include "platform/process.hpp"
 
 namespace tarn::cli {
 namespace {
@@ -35,7 +34,7 @@ public:
         if (ctx_.stop.requested()) return stopped();
         if (!flush()) return false;  // keep the message next to the lines it follows
         std::string message = text + '\n';
-        writeAll(STDERR_FILENO, message);
+        platform::writeAll(platform::Stream::Error, message);
         refused_ = true;
         return true;
     }
@@ -77,10 +76,11 @@ void readLines(Batch& batch, Context& ctx) {
     });
     char block[1 << 16];
     for (;;) {
-        const ssize_t got = ::read(STDIN_FILENO, block, sizeof block);
+        int error = 0;
+        const std::ptrdiff_t got = platform::readInput(block, sizeof block, error);
         if (got < 0) {
-            if (errno == EINTR && !ctx.stop.requested()) continue;
-            if (errno == EINTR) batch.stopped();
+            if (error == EINTR && !ctx.stop.requested()) continue;
+            if (error == EINTR) batch.stopped();
             return;
         }
         if (got == 0) break;

@@ -1,5 +1,7 @@
 // tarn-cli: the command-line front end over the same engine as the desktop program.
 #include <CLI/CLI.hpp>
+#include <algorithm>
+#include <filesystem>
 #include <iostream>
 #include <sstream>
 
@@ -8,8 +10,21 @@
 #include "core/app_folder.hpp"
 #include "core/data_folder.hpp"
 #include "core/exception_text.hpp"
+#include "core/path_text.hpp"
+#include "platform/process.hpp"
 
 namespace {
+
+// CLI11's own check reads the name in the local code page on Windows; names are UTF-8 here.
+const CLI::Validator kExistingFolder(
+    [](std::string& name) {
+        std::error_code ec;
+        const std::filesystem::path path = tarn::pathFromUtf8(name);
+        if (std::filesystem::is_directory(path, ec)) return std::string();
+        if (std::filesystem::exists(path, ec)) return "Directory is actually a file: " + name;
+        return "Directory does not exist: " + name;
+    },
+    "DIR", "DIR");
 
 int run(int argc, char** argv) {
     tarn::StopSignal stop;
@@ -25,7 +40,7 @@ int run(int argc, char** argv) {
     app.add_option("--folder", folder,
                    "Folder of primes.txt and primes.ini (default: the program's folder, or the "
                    "user's data folder for an installed copy)")
-        ->check(CLI::ExistingDirectory)
+        ->check(kExistingFolder)
         ->default_str(tarn::chooseDataFolder(programFolder, tarn::currentSurroundings()));
     app.parse_complete_callback([&] {
         ctx.folder =
@@ -39,7 +54,11 @@ int run(int argc, char** argv) {
 
     tarn::cli::installInterruptHandler(stop);
     try {
-        app.parse(argc, argv);
+        // CLI11 takes the arguments last first, without the program's name.
+        std::vector<std::string> arguments = tarn::platform::utf8Arguments(argc, argv);
+        if (!arguments.empty()) arguments.erase(arguments.begin());
+        std::reverse(arguments.begin(), arguments.end());
+        app.parse(arguments);
     } catch (const CLI::ParseError& e) {
         // --help and --version: their text goes out like every other, so a failed write shows.
         std::ostringstream out;
@@ -60,4 +79,7 @@ int run(int argc, char** argv) {
 
 }  // namespace
 
-int main(int argc, char** argv) { return tarn::cli::finishStandardOutput(run(argc, argv)); }
+int main(int argc, char** argv) {
+    tarn::platform::useBinaryStandardStreams();
+    return tarn::cli::finishStandardOutput(run(argc, argv));
+}

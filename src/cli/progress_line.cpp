@@ -1,10 +1,10 @@
 #include "cli/progress_line.hpp"
 
-#include <unistd.h>
-
 #include <algorithm>
 #include <chrono>
 #include <cstdio>
+
+#include "platform/process.hpp"
 
 namespace tarn::cli {
 namespace {
@@ -21,7 +21,7 @@ std::string clockText(double seconds) {
 }  // namespace
 
 ProgressLine::ProgressLine(std::function<ProgressSample()> sample) : sample_(std::move(sample)) {
-    if (::isatty(2)) thread_ = std::thread([this] { run(); });
+    if (platform::isTerminal(platform::Stream::Error)) thread_ = std::thread([this] { run(); });
 }
 
 ProgressLine::~ProgressLine() {

@@ -1,13 +1,12 @@
 #include "cli/standard_output.hpp"
 
-#include <unistd.h>
-
 #include <cerrno>
 #include <cstdio>
 #include <string>
 
 #include "cli/cli_context.hpp"
 #include "core/file_messages.hpp"
+#include "platform/process.hpp"
 
 namespace tarn::cli {
 namespace {
@@ -15,20 +14,8 @@ namespace {
 int g_failure = 0;
 }  // namespace
 
-int writeAll(int fd, std::string_view text) {
-    while (!text.empty()) {
-        const ssize_t written = ::write(fd, text.data(), text.size());
-        if (written < 0) {
-            if (errno == EINTR) continue;
-            return errno;
-        }
-        text.remove_prefix(static_cast<std::size_t>(written));
-    }
-    return 0;
-}
-
 bool writeStandardOutput(std::string_view text) {
-    if (g_failure == 0) g_failure = writeAll(STDOUT_FILENO, text);
+    if (g_failure == 0) g_failure = platform::writeAll(platform::Stream::Output, text);
     return g_failure == 0;
 }
 
@@ -39,7 +26,7 @@ int finishStandardOutput(int code) {
         g_failure = errno != 0 ? errno : EIO;
     if (g_failure == 0) return code;
     const std::string message = fileWriteFailure("standard output", systemReason(g_failure)) + '\n';
-    writeAll(STDERR_FILENO, message);
+    platform::writeAll(platform::Stream::Error, message);
     return kIoFailure;
 }
 

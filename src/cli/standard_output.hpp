@@ -11,9 +11,6 @@ namespace tarn::cli {
 // and every call returns false.
 bool writeStandardOutput(std::string_view text);
 
-// Writes all of `text` to the descriptor; the system's error number, or 0 once all is written.
-int writeAll(int fd, std::string_view text);
-
 // `code`, or kIoFailure with "The file standard output could not be written: <reason>." on
 // standard error when any write to standard output failed (the C streams are flushed first).
 int finishStandardOutput(int code);

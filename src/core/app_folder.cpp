@@ -11,7 +11,9 @@ namespace fs = std::filesystem;
 namespace tarn {
 
 std::string withTrailingSeparator(std::string folder) {
-    if (folder.empty() || folder.back() != kPathSeparator) folder += kPathSeparator;
+    // '/' separates folders on Windows too.
+    if (folder.empty() || (folder.back() != kPathSeparator && folder.back() != '/'))
+        folder += kPathSeparator;
     return folder;
 }
 
@@ -24,8 +26,8 @@ std::string AppFolder() {
 
 bool FileExists(const std::string& name) {
     if (name.empty() || name.back() == kPathSeparator || name.back() == '/') return false;
-    const fs::path path(name);
-    const std::string leaf = path.filename().string();
+    const fs::path path = pathFromUtf8(name);
+    const std::string leaf = utf8(path.filename());
     if (!leaf.empty() && leaf.front() == '.') return false;  // hidden on this system
     std::error_code ec;
     return fs::is_regular_file(path, ec) && !ec;

@@ -5,34 +5,29 @@
 
 #include <string>
 
+#include "platform/folder_hold.hpp"
+
 namespace tarn {
 
-// An advisory, exclusive flock(2) on the folder, taken without waiting. The kernel drops it with
-// the last holder's file, so a crashed holder never leaves a stale lock behind.
+// An exclusive hold on the folder, taken without waiting. The system drops it with the last
+// holder's handle, so a crashed holder never leaves a stale lock behind.
 class FolderLock {
 public:
-    FolderLock() = default;  // holds nothing
-    ~FolderLock() { release(); }
-    FolderLock(FolderLock&& other) noexcept;
-    FolderLock& operator=(FolderLock&& other) noexcept;
-    FolderLock(const FolderLock&) = delete;
-    FolderLock& operator=(const FolderLock&) = delete;
-
     // Takes the lock of `folder` (with or without a trailing separator). Every attempt stands on
     // its own, so a second one fails while the first is held, even within one process.
     static FolderLock tryTake(const std::string& folder);
 
-    bool held() const { return fd_ >= 0; }
+    bool held() const { return hold_.held(); }
     // Why the attempt failed (errno); 0 when the lock is held.
     int error() const { return error_; }
     // The attempt failed because another holder has the lock; any other failure (a folder that
     // cannot be opened, a file system without locks) says nothing about other jobs.
     bool busy() const;
 
-    void release();
+    void release() { hold_.release(); }
 
 private:
-    int fd_ = -1;
+    platform::FolderHold hold_;
     int error_ = 0;
 };
 

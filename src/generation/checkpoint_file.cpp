@@ -3,15 +3,13 @@
 // crash leaves the old line or the new one.
 #include "generation/checkpoint_file.hpp"
 
-#include <fcntl.h>
-#include <unistd.h>
-
 #include <cerrno>
 #include <climits>
 #include <cstring>
 
 #include "core/file_messages.hpp"
 #include "core/number.hpp"
+#include "platform/files.hpp"
 
 namespace tarn {
 namespace {
@@ -42,42 +40,28 @@ std::optional<std::int64_t> nextNumber(std::string_view text, bool cut, std::siz
     return static_cast<std::int64_t>(value);
 }
 
-// Makes a rename in the folder durable; a file system that cannot sync folders (EINVAL) has
-// nothing more to do.
-int syncFolderOf(const std::string& path) {
-    const std::size_t slash = path.rfind('/');
-    const std::string folder = slash == std::string::npos ? "." : path.substr(0, slash + 1);
-    const int fd = ::open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
-    if (fd < 0) return errno;
-    int error = ::fsync(fd) == 0 || errno == EINVAL ? 0 : errno;
-    ::close(fd);
-    return error;
-}
-
 // Up to kCheckpointReadLimit bytes of the file into `text`, and whether the file goes on beyond
 // them; the system's error number, or 0 once it is read. Opened without waiting, so that a pipe in
 // the file's place cannot hold up the program.
 int readFileStart(const std::string& path, std::string& text, bool& cut) {
-    const int fd = ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
-    if (fd < 0) return errno;
     int error = 0;
+    platform::File file = platform::File::open(path, platform::File::Mode::ReadNoWait, error);
+    if (error != 0) return error;
     char block[kCheckpointReadLimit + 1];
     std::size_t size = 0;
     while (size < sizeof block) {
-        const ssize_t got = ::read(fd, block + size, sizeof block - size);
+        const std::ptrdiff_t got = file.read(block + size, sizeof block - size, error);
         if (got > 0) {
             size += static_cast<std::size_t>(got);
         } else if (got == 0) {
             break;
-        } else if (errno != EINTR) {
-            error = errno;  // a folder in the file's place gives EISDIR here
-            break;
+        } else if (error != EINTR) {
+            return error;  // a folder in the file's place gives EISDIR here
         }
     }
-    ::close(fd);
     cut = size > kCheckpointReadLimit;
     text.assign(block, cut ? kCheckpointReadLimit : size);
-    return error;
+    return 0;
 }
 
 }  // namespace
@@ -119,21 +103,8 @@ std::optional<Checkpoint> parseCheckpoint(std::string_view text, bool cut) {
 }
 
 std::string writeCheckpoint(const std::string& path, const Checkpoint& checkpoint) {
-    const std::string temporary = path + ".tmp";
-    const std::string line = checkpointLine(checkpoint);
-    const int fd = ::open(temporary.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0644);
-    if (fd < 0) return systemReason(errno);
-    const ssize_t written = ::write(fd, line.data(), line.size());
-    int error = written == static_cast<ssize_t>(line.size()) ? 0 : (written < 0 ? errno : ENOSPC);
-    if (error == 0 && ::fdatasync(fd) != 0) error = errno;
-    if (::close(fd) != 0 && error == 0) error = errno;
-    if (error == 0 && ::rename(temporary.c_str(), path.c_str()) != 0) error = errno;
-    if (error != 0) {
-        ::unlink(temporary.c_str());
-        return systemReason(error);
-    }
-    if (error = syncFolderOf(path); error != 0) return systemReason(error);
-    return {};
+    const int error = platform::replaceFileDurably(path, checkpointLine(checkpoint));
+    return error == 0 ? std::string() : systemReason(error);
 }
 
 }  // namespace tarn

@@ -1,7 +1,10 @@
 // The front half of the generation job: a pool of sieving threads. The turns to generate are cut
-// into chunks; each thread claims the next chunk, sieves it segment by segment with a wheel
-// sieve of its own (moved on past the chunks that other threads took), counts its primes, and
-// formats them into a buffer of the write pipeline, which writes the buffers in chunk order.
+// into chunks; each thread claims the next chunk, has each group of the shared bucket sieve cross
+// off its large primes in it (every group takes the chunks in claim order, so while one thread
+// works with one group another works with the next), sieves it segment by segment with the
+// medium primes of a wheel sieve of its own (moved on past the chunks that other threads took),
+// counts its primes, and formats them into a buffer of the write pipeline, which writes the
+// buffers in chunk order.
 // Serial numbers of enumerated records run on across chunks: a chunk learns how many records
 // come before it from the chunk before, which is known as soon as that one is sieved, so the
 // formatting of all chunks goes on at once.
@@ -20,6 +23,8 @@
 #include <vector>
 
 #include "core/stop_signal.hpp"
+#include "core/wheel.hpp"
+#include "generation/bucket_sieve.hpp"
 #include "generation/generation_job.hpp"
 #include "generation/wheel_sieve.hpp"
 #include "generation/write_pipeline.hpp"
@@ -45,9 +50,9 @@ public:
     ChunkProducer(const ChunkProducer&) = delete;
     ChunkProducer& operator=(const ChunkProducer&) = delete;
 
-    // Starts `threads` sieving threads (at least one) and returns at once; the first thread
-    // takes `first`, a sieve that starts at the plan's first turn.
-    void start(int threads, WheelSieve&& first);
+    // Starts `threads` sieving threads (at least one) and returns at once; they share `large`,
+    // made for the plan's chunks, which must outlive them.
+    void start(int threads, BucketSieve& large);
     // Waits until every thread has left.
     void join();
 
@@ -58,7 +63,7 @@ private:
         std::int64_t endTurn = 0;
     };
 
-    void work(std::optional<WheelSieve> sieve);
+    void work();
     Claim claim();
     // Sieves the chunk into `sieved` and returns the turn it ended before (early on a stop).
     std::int64_t sieveChunk(WheelSieve& sieve, const Claim& chunk,
@@ -78,8 +83,14 @@ private:
     const JobHooks& hooks_;
     JobProgress* progress_;
 
+    // Waits for the group's turn on the chunk, crosses off, and hands the group on; false when
+    // a failure ended the job first.
+    bool crossOff(int group, std::int64_t index, std::uint8_t* bytes, std::int64_t turns);
+
+    BucketSieve* large_ = nullptr;
     std::mutex mutex_;
-    std::condition_variable published_;
+    std::condition_variable published_;     // a chunk's count, a group's next chunk, or a failure
+    std::vector<std::int64_t> groupChunk_;  // the next chunk of each group of large primes
     std::int64_t nextChunk_ = 0;
     bool closed_ = false;  // a stop or a failure: no further chunk is claimed
     bool failed_ = false;  // a thread failed: nobody waits for a chunk count any more

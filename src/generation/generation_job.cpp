@@ -17,10 +17,11 @@
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
 #include "core/file_names.hpp"
+#include "core/wheel.hpp"
+#include "generation/bucket_sieve.hpp"
 #include "generation/chunk_producer.hpp"
 #include "generation/record_formatter.hpp"
 #include "generation/results_change.hpp"
-#include "generation/wheel_sieve.hpp"
 #include "generation/write_pipeline.hpp"
 
 namespace tarn {
@@ -29,21 +30,21 @@ namespace {
 constexpr std::int64_t kSegmentTurns = 32 * 1024;  // 32 KiB of sieve: the first-level cache
 constexpr std::int64_t kSeedCount = 4;             // 2, 3, 5 and 7 come before the first turn
 constexpr std::int64_t kSegmentsPerChunk = 4;      // 2 to 5 MiB of records per write
-// Memory for the sieving threads' own state and their buffers, whatever the core count.
-constexpr std::uint64_t kThreadBudget = 48u << 20;
+// Memory for the sieve and the buffers, whatever the core count.
+constexpr std::uint64_t kSieveBudget = 56u << 20;
 constexpr std::uint64_t kChunkRecordBytes = 40;  // per turn at most, in practice
 
-// One sieving thread per core, as many as the memory budget holds: each keeps the crossing-off
-// state of every sieving prime (16 bytes each, about 30 MB at the top of the range) and fills
-// chunk buffers; two buffers more keep the writer busy.
+// One sieving thread per core, as many as the memory budget holds: the large primes' buckets
+// (about 27 MB at the top of the range) are shared, and each thread fills a chunk buffer (two
+// buffers more keep the writer busy) and keeps a few hundred kilobytes of its own.
 int sievingThreads(int requested, std::int64_t limit, std::int64_t chunkTurns) {
     int threads = requested > 0 ? requested : static_cast<int>(std::thread::hardware_concurrency());
-    const double root = std::sqrt(static_cast<double>(std::max<std::int64_t>(limit, 100)));
-    const auto sieveBytes = static_cast<std::uint64_t>(16 * 1.3 * root / std::log(root));
+    const std::uint64_t shared = BucketSieve::bytesFor(limit);
     const std::uint64_t chunkBytes =
         static_cast<std::uint64_t>(chunkTurns) * (kChunkRecordBytes + 1);
-    const auto fit = static_cast<int>(kThreadBudget / (sieveBytes + 2 * chunkBytes));
-    return std::clamp(threads, 1, std::max(fit, 1));
+    const auto buffers =
+        static_cast<int>((kSieveBudget - std::min(shared, kSieveBudget)) / chunkBytes);
+    return std::clamp(threads, 1, std::max(buffers - 2, 1));
 }
 
 // A fresh file starts with the records of 2, 3, 5 and 7, which no turn holds.
@@ -149,11 +150,23 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
     const std::int64_t end =
         std::max(first, spec.limit >= kFirstTurnStart ? turnIndex(spec.limit) + 1 : 0);
 
-    // The first thread's sieve is built before any file is touched: at the top of the range it
-    // is the job's largest piece of memory.
-    std::optional<WheelSieve> sieve;
+    ChunkPlan plan;
+    plan.firstTurn = first;
+    plan.endTurn = end;
+    plan.limit = spec.limit;
+    plan.recordsBefore = spec.append ? spec.primeCountBefore : kSeedCount;
+    plan.firstSequence = spec.append ? 0 : 1;
+    plan.enumerated = spec.enumerated;
+    plan.segmentTurns = hooks.turnsPerBatch > 0 ? hooks.turnsPerBatch : kSegmentTurns;
+    plan.chunkTurns =
+        hooks.turnsPerChunk > 0 ? hooks.turnsPerChunk : plan.segmentTurns * kSegmentsPerChunk;
+
+    const int threads = sievingThreads(spec.threads, spec.limit, plan.chunkTurns);
+    // The large primes' buckets are built before any file is touched: at the top of the range
+    // they are the job's largest piece of memory.
+    std::optional<BucketSieve> large;
     try {
-        sieve.emplace(first, spec.limit);
+        large.emplace(first, end, spec.limit, plan.chunkTurns, threads);
     } catch (const std::bad_alloc&) {
         result.error = "There is not enough memory to generate the primes up to " +
                        std::to_string(spec.limit) + ".";
@@ -189,18 +202,6 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
         progress->primeCount.store(start.primeCount, std::memory_order_relaxed);
     }
 
-    ChunkPlan plan;
-    plan.firstTurn = first;
-    plan.endTurn = end;
-    plan.limit = spec.limit;
-    plan.recordsBefore = spec.append ? spec.primeCountBefore : kSeedCount;
-    plan.firstSequence = spec.append ? 0 : 1;
-    plan.enumerated = spec.enumerated;
-    plan.segmentTurns = hooks.turnsPerBatch > 0 ? hooks.turnsPerBatch : kSegmentTurns;
-    plan.chunkTurns =
-        hooks.turnsPerChunk > 0 ? hooks.turnsPerChunk : plan.segmentTurns * kSegmentsPerChunk;
-    const int threads = sievingThreads(spec.threads, spec.limit, plan.chunkTurns);
-
     FileMark written, durable;
     {
         WritePipeline pipeline(*sink, hooks, checkpointPath, spec.limit, threads + 2, start,
@@ -209,7 +210,7 @@ JobResult runGuardedJob(const JobSpec& spec, const StopSignal& stop, JobProgress
             pipeline.start();
             if (!spec.append) handSeeds(pipeline, spec.enumerated);
             ChunkProducer producer(plan, pipeline, stop, hooks, progress);
-            producer.start(threads, std::move(*sieve));
+            producer.start(threads, *large);
             producer.join();
         } catch (...) {
             // What was handed over is written or not; the rest is dropped.

@@ -5,6 +5,7 @@
 #include <optional>
 
 #include "core/file_messages.hpp"
+#include "core/path_text.hpp"
 #include "core/wheel.hpp"
 
 namespace tarn {
@@ -36,7 +37,7 @@ std::optional<KeptRecords> keptRecords(const std::string& path, std::uint64_t tr
                                        std::int64_t limit) {
     const std::uint64_t from = trusted - std::min(trusted, 2 * kLongestRecord);
     std::string tail(trusted - from, '\0');
-    std::ifstream in(path, std::ios::binary);
+    std::ifstream in(pathFromUtf8(path), std::ios::binary);
     if (!in.seekg(static_cast<std::streamoff>(from)) ||
         !in.read(tail.data(), static_cast<std::streamsize>(tail.size())))
         return std::nullopt;

@@ -22,9 +22,6 @@
 // record is damaged whatever its middle holds, so only its start and its end are kept.
 #include "generation/results_scan.hpp"
 
-#include <fcntl.h>
-#include <unistd.h>
-
 #include <bit>
 #include <cerrno>
 #include <cstring>
@@ -37,6 +34,7 @@
 #include "generation/results_fast_run.hpp"
 #include "generation/results_line_check.hpp"
 #include "generation/results_scan_keys.hpp"
+#include "platform/files.hpp"
 
 namespace tarn {
 namespace {
@@ -115,13 +113,8 @@ private:
     Key ceiling_;
 };
 
-struct FileCloser {
-    int fd;
-    ~FileCloser() { ::close(fd); }
-};
-
-ResultsScan::Outcome readLines(int fd, Scanner& scanner, ResultsScan& scan, const StopSignal& stop,
-                               std::size_t blockBytes) {
+ResultsScan::Outcome readLines(platform::File& file, Scanner& scanner, ResultsScan& scan,
+                               const StopSignal& stop, std::size_t blockBytes) {
     // Zeroed, so that what the masks and keys read around the lines is defined.
     const auto buffer = std::make_unique<char[]>(kFrontRoom + blockBytes + kBackRoom);
     char* const block = buffer.get() + kFrontRoom;
@@ -137,10 +130,11 @@ ResultsScan::Outcome readLines(int fd, Scanner& scanner, ResultsScan& scan, cons
     };
     for (;;) {
         if (stop.requested()) return ResultsScan::Outcome::Stopped;
-        const ssize_t got = ::read(fd, block, blockBytes);
+        int error = 0;
+        const std::ptrdiff_t got = file.read(block, blockBytes, error);
         if (got < 0) {
-            if (errno == EINTR) continue;
-            scan.problem = systemReason(errno);
+            if (error == EINTR) continue;
+            scan.problem = systemReason(error);
             return ResultsScan::Outcome::Unreadable;
         }
         if (got == 0) break;
@@ -180,23 +174,18 @@ ResultsScan::Outcome readLines(int fd, Scanner& scanner, ResultsScan& scan, cons
 ResultsScan scanResults(const std::string& path, std::int64_t resumePoint, const StopSignal& stop,
                         std::size_t blockBytes) {
     ResultsScan scan;
-    const int fd = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
-    if (fd < 0) {
-        scan.problem = systemReason(errno);
+    int error = 0;
+    platform::File file = platform::File::open(path, platform::File::Mode::Read, error);
+    if (error == 0) error = file.size(scan.fileBytes);
+    if (error != 0) {
+        scan.problem = systemReason(error);
         return scan;
     }
-    const FileCloser closer{fd};
-    const off_t size = ::lseek(fd, 0, SEEK_END);
-    if (size < 0 || ::lseek(fd, 0, SEEK_SET) != 0) {
-        scan.problem = systemReason(errno);
-        return scan;
-    }
-    scan.fileBytes = static_cast<std::uint64_t>(size);
-    ::posix_fadvise(fd, 0, 0, POSIX_FADV_SEQUENTIAL);
+    file.adviseSequential();
 
     scan.outcome = ResultsScan::Outcome::Sound;
     Scanner scanner(resumePoint, scan);
-    scan.outcome = readLines(fd, scanner, scan, stop, blockBytes);
+    scan.outcome = readLines(file, scanner, scan, stop, blockBytes);
     if (scan.outcome != ResultsScan::Outcome::Sound) return scan;
 
     if (scan.records == 0) {

@@ -2,11 +2,6 @@
 // until every check has passed, so a refusal leaves both files as they were.
 #include "generation/resume_job.hpp"
 
-#include <unistd.h>
-
-#include <cerrno>
-#include <cstring>
-
 #include "core/entry.hpp"
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
@@ -15,6 +10,7 @@
 #include "generation/checkpoint_file.hpp"
 #include "generation/results_scan.hpp"
 #include "generation/resume_texts.hpp"
+#include "platform/files.hpp"
 
 namespace tarn {
 namespace {
@@ -103,9 +99,10 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
 
     // Records past the checkpoint and a torn last line were written after the last checkpoint
     // of a killed job; the turns that wrote them run again.
-    if (scan.keptBytes < scan.fileBytes &&
-        ::truncate(resultsPath.c_str(), static_cast<off_t>(scan.keptBytes)) != 0)
-        return failed(truncationFailure(resultsPath, systemReason(errno)), resultsPath);
+    if (scan.keptBytes < scan.fileBytes) {
+        if (const int error = platform::truncateFile(resultsPath, scan.keptBytes); error != 0)
+            return failed(truncationFailure(resultsPath, systemReason(error)), resultsPath);
+    }
 
     const ResumeStart start{limit, resumePoint, scan.records, scan.enumerated};
     if (events.onContinuing) events.onContinuing(start);

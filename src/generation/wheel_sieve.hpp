@@ -1,48 +1,53 @@
-// Segmented sieve of Eratosthenes on the 30-wheel. One byte is one wheel turn: turn t starts at
-// 30t + 11 and bit b stands for 30t + 11 + kTurnOffsets[b], the eight numbers of the turn that have
-// no factor 2, 3 or 5. A segment of turns is small enough to stay in the first-level cache.
-// Primes below the segment length cross off along eight fixed-bit progressions of step p bytes
-// (a tight loop per progression); larger primes, which hit a segment a few times at most, walk
-// their multiples along the wheel one by one. State grows with the count of sieving primes up to
-// sqrt(limit), at most 1.9 million of them (about 30 MB at the top of the range).
+// Segmented sieve of Eratosthenes on the 30-wheel, for the primes below kMediumPrimeBound. One
+// byte is one wheel turn: turn t starts at 30t + 11 and bit b stands for 30t + 11 +
+// kTurnOffsets[b], the eight numbers of the turn that have no factor 2, 3 or 5. A segment of
+// turns is small enough to stay in the first-level cache. The multiples of 7 to 19 come from a
+// pattern that repeats every 7 * 11 * 13 * 17 * 19 turns. The other primes hit every segment:
+// those below 2^13 cross off along eight fixed-bit progressions of step p bytes (a tight loop per
+// progression), the rest walk their multiples along the wheel in one loop, which ends once per
+// segment rather than eight times. The few thousand of them make a state of a few hundred
+// kilobytes, one per sieving thread. The larger primes wait in the buckets of bucket_sieve.hpp.
 #pragma once
 
 #include <array>
 #include <cstdint>
 #include <vector>
 
-#include "core/wheel.hpp"
-
 namespace tarn {
+
+// Primes from here on hit a segment of 32 Ki turns at most once per progression.
+inline constexpr std::uint32_t kMediumPrimeBound = 1u << 15;
 
 class WheelSieve {
 public:
-    // Sieves turns from `firstTurn` on, for numbers up to `limit`.
+    // Sieves turns from `firstTurn` on, with the primes below kMediumPrimeBound that sieve up
+    // to `limit`.
     WheelSieve(std::int64_t firstTurn, std::int64_t limit);
 
-    // Sieves the next `turns` turns (consecutive with the previous call) into `bytes`: bit set =
-    // the number is composite.
+    // Marks in the next `turns` turns (consecutive with the previous call) of `bytes` the
+    // multiples of its primes: bit set = composite. Other bits are left as they are.
     void sieveNext(std::uint8_t* bytes, std::size_t turns);
 
     // Moves on to `turn` (not before the next one) without sieving the turns in between, so that
-    // one sieve can serve segments far apart: small primes by a remainder, large ones that have
-    // fallen behind by a division each.
+    // one sieve can serve segments far apart.
     void skipTo(std::int64_t turn);
 
 private:
-    struct Small {
+    struct Medium {
         std::uint32_t p;
         std::array<std::uint64_t, 8> next;  // byte offset from the current segment, per bit
     };
-    struct Large {
-        std::uint64_t multiple;  // next multiple to cross off
-        std::uint32_t p;
-        std::uint32_t wheel;  // position of the multiplier on the wheel of 30
+
+    struct Walker {
+        std::uint32_t prime;  // as packPrime gives it
+        std::uint32_t wheel;  // position of the next multiplier on the wheel
+        std::uint64_t next;   // turn of the next multiple, from the current segment
     };
 
-    std::int64_t turn_;  // first turn of the next segment
-    std::vector<Small> small_;
-    std::vector<Large> large_;
+    std::int64_t turn_;      // first turn of the next segment
+    std::size_t patternAt_;  // where turn_ falls in the pattern
+    std::vector<Medium> medium_;
+    std::vector<Walker> walkers_;
 };
 
 }  // namespace tarn

@@ -3,7 +3,6 @@
 // the one for its system.
 #pragma once
 
-#include <cstdint>
 #include <filesystem>
 #include <optional>
 
@@ -27,17 +26,5 @@ struct UserDataConvention {
     const char* folderName;
 };
 const UserDataConvention& userDataConvention();
-
-// Which file a descriptor or a path names, and its size, so that a job can tell whether the file
-// at its path is still the one it writes. Both return 0 or the system's error number (ENOENT when
-// nothing is at the path).
-struct FileIdentity {
-    std::uint64_t device = 0;
-    std::uint64_t index = 0;
-    std::uint64_t size = 0;
-    bool operator==(const FileIdentity&) const = default;
-};
-int openFileIdentity(int descriptor, FileIdentity& identity);
-int pathFileIdentity(const std::filesystem::path& path, FileIdentity& identity);
 
 }  // namespace tarn::platform

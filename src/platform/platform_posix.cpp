@@ -1,8 +1,6 @@
 #include <fcntl.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
-#include <cerrno>
 #include <cstdlib>
 #include <system_error>
 
@@ -33,27 +31,6 @@ const UserDataConvention& userDataConvention() {
     static const UserDataConvention convention{"XDG_DATA_HOME", "HOME",
                                                fs::path(".local") / "share", "tarn"};
     return convention;
-}
-
-namespace {
-FileIdentity identityOf(const struct stat& info) {
-    return {static_cast<std::uint64_t>(info.st_dev), static_cast<std::uint64_t>(info.st_ino),
-            static_cast<std::uint64_t>(info.st_size)};
-}
-}  // namespace
-
-int openFileIdentity(int descriptor, FileIdentity& identity) {
-    struct stat info {};
-    if (::fstat(descriptor, &info) != 0) return errno;
-    identity = identityOf(info);
-    return 0;
-}
-
-int pathFileIdentity(const fs::path& path, FileIdentity& identity) {
-    struct stat info {};
-    if (::stat(path.c_str(), &info) != 0) return errno;
-    identity = identityOf(info);
-    return 0;
 }
 
 }  // namespace tarn::platform

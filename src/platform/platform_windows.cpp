@@ -1,10 +1,8 @@
 #ifndef NOMINMAX
 #define NOMINMAX
 #endif
-#include <io.h>
 #include <windows.h>
 
-#include <cerrno>
 #include <cstdlib>
 
 #include "platform/platform.hpp"
@@ -50,35 +48,6 @@ const UserDataConvention& userDataConvention() {
     static const UserDataConvention convention{"LOCALAPPDATA", "USERPROFILE",
                                                fs::path("AppData") / "Local", "Tarn"};
     return convention;
-}
-
-namespace {
-int identityOf(HANDLE h, FileIdentity& identity) {
-    BY_HANDLE_FILE_INFORMATION info{};
-    if (!GetFileInformationByHandle(h, &info)) return EIO;
-    identity = {info.dwVolumeSerialNumber,
-                (std::uint64_t{info.nFileIndexHigh} << 32) | info.nFileIndexLow,
-                (std::uint64_t{info.nFileSizeHigh} << 32) | info.nFileSizeLow};
-    return 0;
-}
-}  // namespace
-
-int openFileIdentity(int descriptor, FileIdentity& identity) {
-    const auto h = reinterpret_cast<HANDLE>(_get_osfhandle(descriptor));
-    return h == INVALID_HANDLE_VALUE ? EBADF : identityOf(h, identity);
-}
-
-int pathFileIdentity(const fs::path& path, FileIdentity& identity) {
-    const HANDLE h =
-        CreateFileW(path.c_str(), 0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
-                    nullptr, OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS, nullptr);
-    if (h == INVALID_HANDLE_VALUE) {
-        const DWORD error = GetLastError();
-        return error == ERROR_FILE_NOT_FOUND || error == ERROR_PATH_NOT_FOUND ? ENOENT : EIO;
-    }
-    const int error = identityOf(h, identity);
-    CloseHandle(h);
-    return error;
 }
 
 }  // namespace tarn::platform

@@ -5,6 +5,7 @@
 #include <filesystem>
 
 #include "core/number.hpp"
+#include "core/path_text.hpp"
 
 namespace tarn {
 namespace {
@@ -35,7 +36,7 @@ std::string largeFileQuestion(double figure) {
 
 std::optional<std::uint64_t> fileLength(const std::string& path) {
     std::error_code ec;
-    const auto size = std::filesystem::file_size(path, ec);
+    const auto size = std::filesystem::file_size(pathFromUtf8(path), ec);
     if (ec) return std::nullopt;
     return size;
 }

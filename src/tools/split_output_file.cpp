@@ -3,13 +3,10 @@
 // short write (a signal, a nearly full disk) never loses or reorders a byte.
 #include "tools/split_output_file.hpp"
 
-#include <fcntl.h>
-#include <unistd.h>
-
 #include <algorithm>
-#include <cerrno>
 #include <cstring>
 #include <filesystem>
+#include <system_error>
 #include <utility>
 
 #include "core/file_messages.hpp"
@@ -19,16 +16,14 @@ namespace tarn {
 SplitOutputFile::SplitOutputFile(const SplitWriteFunction& writeSome)
     : writeSome_(writeSome), staging_(kSplitStagingSize) {}
 
-SplitOutputFile::~SplitOutputFile() {
-    if (fd_ >= 0) ::close(fd_);
-}
+SplitOutputFile::~SplitOutputFile() = default;
 
 bool SplitOutputFile::open(std::string name) {
     name_ = std::move(name);
     size_ = 0;
-    errno = 0;
-    fd_ = ::open(name_.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666);
-    return fd_ >= 0 || fail(errno);
+    int error = 0;
+    file_ = platform::File::open(name_, platform::File::Mode::Create, error);
+    return error == 0 || fail(error);
 }
 
 bool SplitOutputFile::write(const char* bytes, std::size_t count) {
@@ -41,20 +36,15 @@ bool SplitOutputFile::write(const char* bytes, std::size_t count) {
 
 bool SplitOutputFile::close() {
     bool ok = flush();
-    if (fd_ >= 0) {
-        errno = 0;
-        if (::close(fd_) != 0 && ok) ok = fail(errno);
-        fd_ = -1;
-    }
+    if (const int error = file_.close(); error != 0 && ok) ok = fail(error);
     return ok;
 }
 
 bool SplitOutputFile::dropLast(std::uint64_t count) {
     if (!flush()) return false;
-    std::error_code error;
     size_ -= std::min(size_, count);
-    std::filesystem::resize_file(name_, size_, error);
-    return !error || fail(error.value());
+    const int error = file_.truncate(size_);
+    return error == 0 || fail(error);
 }
 
 bool SplitOutputFile::discard() {
@@ -71,21 +61,16 @@ bool SplitOutputFile::flush() {
     return count == 0 || put(staging_.data(), count);
 }
 
-// The system may take less than asked (a full disk, a signal): the rest is offered again
-// until it is all written or the system refuses with a reason.
 bool SplitOutputFile::put(const char* bytes, std::size_t count) {
-    while (count > 0) {
-        errno = 0;
-        const ssize_t done =
-            writeSome_ ? writeSome_(fd_, bytes, count) : ::write(fd_, bytes, count);
-        if (done < 0 && errno == EINTR) continue;
-        // A write that takes nothing would be offered again forever.
-        if (done <= 0) return fail(done < 0 ? errno : 0);
-        bytes += done;
-        count -= static_cast<std::size_t>(done);
-        size_ += static_cast<std::uint64_t>(done);
-    }
-    return true;
+    std::size_t written = 0;
+    const int error = writeSome_ ? platform::writeAllWith(
+                                       [this](const char* data, std::size_t size, int& err) {
+                                           return writeSome_(file_, data, size, err);
+                                       },
+                                       bytes, count, written)
+                                 : file_.writeAll(bytes, count, written);
+    size_ += written;
+    return error == 0 || fail(error);
 }
 
 bool SplitOutputFile::fail(int err) {

@@ -40,7 +40,7 @@ private:
     bool fail(int err);
 
     const SplitWriteFunction& writeSome_;
-    int fd_ = -1;
+    platform::File file_;
     std::string name_;
     std::string error_;
     std::vector<char> staging_;

@@ -3,9 +3,6 @@
 // edge cut off is carried over, so memory stays constant whatever the file size.
 #include "tools/split_results.hpp"
 
-#include <fcntl.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <cerrno>
 #include <cstring>
@@ -23,22 +20,11 @@ namespace {
 // The smallest buffer that works: a CR kept back from a long record plus one new byte.
 constexpr std::size_t kMinimumBlockSize = 2;
 
-struct InputFile {
-    explicit InputFile(int descriptor) : fd(descriptor) {}
-    ~InputFile() {
-        if (fd >= 0) ::close(fd);
-    }
-    InputFile(const InputFile&) = delete;
-    InputFile& operator=(const InputFile&) = delete;
-    int fd;
-};
-
 SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
                         const SplitOptions& options) {
-    errno = 0;
-    const InputFile in(::open(resultsPath.c_str(), O_RDONLY | O_CLOEXEC));
-    if (in.fd < 0) {
-        const int err = errno;
+    int err = 0;
+    platform::File in = platform::File::open(resultsPath, platform::File::Mode::Read, err);
+    if (err != 0) {
         return {SplitStatus::Failed, 0,
                 err == ENOENT ? "The results file " + resultsPath + " was not found."
                               : fileReadFailure(resultsPath, systemReason(err))};
@@ -54,12 +40,12 @@ SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
         if (!partial && copier.stopHere()) return copier.finish(SplitStatus::Stopped);
         // One plain read: from a pipe it answers with what is there, so a stop raised while
         // the split waits for more is seen as soon as the read returns.
-        const ssize_t got = ::read(in.fd, data + carry, capacity - carry);
+        const std::ptrdiff_t got = in.read(data + carry, capacity - carry, err);
         if (got < 0) {
             // A signal (the command line's Ctrl-C) broke the wait: look at the stop again.
-            if (errno == EINTR) continue;
+            if (err == EINTR) continue;
             return copier.finish(SplitStatus::Failed,
-                                 fileReadFailure(resultsPath, systemReason(errno)));
+                                 fileReadFailure(resultsPath, systemReason(err)));
         }
         if (options.progress) options.progress->bytesRead.fetch_add(got, std::memory_order_relaxed);
         if (got == 0) {

@@ -11,6 +11,7 @@
 #include <string>
 
 #include "core/stop_signal.hpp"
+#include "platform/files.hpp"
 
 namespace tarn {
 
@@ -21,10 +22,10 @@ inline constexpr std::size_t kSplitBlockSize = std::size_t{1} << 20;
 // or more go to the system directly.
 inline constexpr std::size_t kSplitStagingSize = std::size_t{64} << 10;
 
-// Writes up to count bytes to the descriptor like the system's write: the bytes taken, or -1
-// with errno set.
-using SplitWriteFunction =
-    std::function<std::ptrdiff_t(int fd, const char* bytes, std::size_t count)>;
+// Writes up to count bytes to the file like the system's write: the bytes taken, or -1 with the
+// error number in `error`.
+using SplitWriteFunction = std::function<std::ptrdiff_t(platform::File& file, const char* bytes,
+                                                        std::size_t count, int& error)>;
 
 // The folder text as shown to the user, a separator and "primes", joined as they stand:
 // a root that already ends in the separator gives a doubled one ("/" gives "//primes").

@@ -1,5 +1,6 @@
 // tarn-cli while another job holds the folder's files: generate, resume and split are refused
-// with exit code 2 and leave every file as it was; once the lock is free they run.
+// with exit code 2 and leave every file as it was; once the lock is free they run, also after its
+// holder was killed.
 #include <gtest/gtest.h>
 
 #include <filesystem>
@@ -44,6 +45,16 @@ TEST(BusyFolder, JobResumeAndSplitAreRefusedWhileAnotherHolderHasTheLock) {
         held.release();
         EXPECT_EQ(runCli(args, output.path()).code, 0) << command;
     }
+}
+
+TEST(BusyFolder, AKilledHolderLeavesNoStaleLock) {
+    TempFolder folder, output;
+    CliChild job({"--folder", folder.path(), "generate", "900000000000"}, output.path());
+    waitForGrowth(folder.path() + "primes.txt", 0);
+    EXPECT_TRUE(FolderLock::tryTake(folder.path()).busy()) << "the job holds it";
+    job.kill();
+    EXPECT_EQ(job.wait(), kKilledExitCode);
+    EXPECT_TRUE(FolderLock::tryTake(folder.path()).held());
 }
 
 }  // namespace

@@ -2,11 +2,6 @@
 // at exit codes and texts, send it signals and kill it at any moment.
 #pragma once
 
-#include <fcntl.h>
-#include <signal.h>
-#include <spawn.h>
-#include <sys/wait.h>
-
 #include <chrono>
 #include <filesystem>
 #include <ostream>
@@ -14,9 +9,9 @@
 #include <thread>
 #include <vector>
 
+#include "core/path_text.hpp"
+#include "support/child_process.hpp"
 #include "support/temp_folder.hpp"
-
-extern char** environ;
 
 namespace tarn::test {
 
@@ -26,70 +21,35 @@ inline void waitForGrowth(const std::string& path, std::uintmax_t bytes) {
     const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(20);
     const auto size = [&] {
         std::error_code error;
-        const auto got = std::filesystem::file_size(path, error);
+        const auto got = std::filesystem::file_size(pathFromUtf8(path), error);
         return error ? 0 : got;
     };
     while (size() <= bytes && std::chrono::steady_clock::now() < until)
         std::this_thread::sleep_for(std::chrono::milliseconds(2));
 }
 
-class CliChild {
+class CliChild : public ChildProcess {
 public:
     // Starts TARN_CLI_PATH with `args`; stdout and stderr go to files in `outputFolder`, and
     // standard input comes from `inputPath` when one is given. Standard output goes to
     // `stdoutPath` instead (such as /dev/full) when one is given.
-    CliChild(std::vector<std::string> args, const std::string& outputFolder,
+    CliChild(const std::vector<std::string>& args, const std::string& outputFolder,
              const std::string& inputPath = "", const std::string& stdoutPath = "")
-        : outPath_(outputFolder + "cli.out"), errPath_(outputFolder + "cli.err") {
-        args.insert(args.begin(), TARN_CLI_PATH);
-        std::vector<char*> argv;
-        for (std::string& a : args) argv.push_back(a.data());
-        argv.push_back(nullptr);
-        posix_spawn_file_actions_t actions;
-        posix_spawn_file_actions_init(&actions);
-        if (!inputPath.empty())
-            posix_spawn_file_actions_addopen(&actions, 0, inputPath.c_str(), O_RDONLY, 0);
-        const std::string& stdoutTarget = stdoutPath.empty() ? outPath_ : stdoutPath;
-        for (const auto& [fd, path] : {std::pair{1, stdoutTarget.c_str()}, {2, errPath_.c_str()}})
-            posix_spawn_file_actions_addopen(&actions, fd, path, O_WRONLY | O_CREAT | O_TRUNC,
-                                             0644);
-        if (posix_spawn(&pid_, argv[0], &actions, nullptr, argv.data(), environ) != 0) pid_ = -1;
-        posix_spawn_file_actions_destroy(&actions);
-    }
-    ~CliChild() {
-        if (!finished() && ::kill(pid_, SIGKILL) == 0) wait();
-    }
-    CliChild(const CliChild&) = delete;
-    CliChild& operator=(const CliChild&) = delete;
-
-    void signal(int number) { ::kill(pid_, number); }
+        : ChildProcess(TARN_CLI_PATH, args, inputPath,
+                       stdoutPath.empty() ? outputFolder + "cli.out" : stdoutPath,
+                       outputFolder + "cli.err"),
+          outPath_(outputFolder + "cli.out"),
+          errPath_(outputFolder + "cli.err") {}
 
     // Waits until the child has written something to standard output, so that a signal lands
     // inside its work however slowly the program starts (sanitizer builds on a busy machine).
     void waitForOutput() const { waitForGrowth(outPath_, 0); }
 
-    // The exit code, or 128 + the signal that ended it; -1 when the program did not start.
-    int wait() {
-        while (!reap(0)) continue;
-        return code_;
-    }
-    // Whether it has ended, without waiting for it.
-    bool finished() { return reap(WNOHANG); }
     std::string out() const { return readFile(outPath_); }  // "" when stdout went elsewhere
     std::string err() const { return readFile(errPath_); }
 
 private:
-    bool reap(int flags) {
-        int status = 0;
-        if (pid_ <= 0 || code_ >= 0) return true;
-        if (::waitpid(pid_, &status, flags) != pid_) return false;
-        code_ = WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
-        return true;
-    }
-
     std::string outPath_, errPath_;
-    pid_t pid_ = -1;
-    int code_ = -1;
 };
 
 struct CliRun {

@@ -85,7 +85,8 @@ TEST(JobCommands, TerminationStopsTheJobWithExitCodeThree) {
                        cli.output.path());
         // The signal comes once the job is writing records, however slowly the program starts.
         waitForGrowth(cli.results(), before + 100'000);
-        child.signal(resume ? SIGHUP : SIGTERM);
+        const bool sent = resume ? child.hangUp() : child.terminate();
+        if (!sent) GTEST_SKIP() << "no console events (Wine: stop_under_wine.sh)";
         EXPECT_EQ(child.wait(), 3) << child.err();
         EXPECT_EQ(child.err(), (resume ? kResumeNotes : "") + "All calculations were stopped!\n");
         EXPECT_EQ(child.out(), "");

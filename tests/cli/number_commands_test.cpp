@@ -77,7 +77,7 @@ TEST(CliNumbers, InterruptEndsTheBatchWithExitCodeThree) {
     writeFile(folder.path() + "in.txt", input);
     CliChild child({"factorize"}, folder.path(), folder.path() + "in.txt");
     child.waitForOutput();
-    child.signal(SIGINT);
+    if (!child.interrupt()) GTEST_SKIP() << "no console events (Wine: stop_under_wine.sh)";
     EXPECT_EQ(child.wait(), 3);
     // Whatever was done is there, in whole lines, and far from all of it.
     const std::string out = child.out();

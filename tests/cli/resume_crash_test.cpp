@@ -1,4 +1,4 @@
-// Kill tests: tarn-cli generate and resume are killed with SIGKILL at random moments, then
+// Kill tests: tarn-cli generate and resume are killed at random moments, then
 // resumed until the job completes; the results file must be byte for byte that of one
 // uninterrupted run. A kill before the first periodic checkpoint leaves nothing to resume, and
 // then the job is simply started again.
@@ -60,13 +60,13 @@ TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
             const bool kill = attempt < 4;  // then let it run to its end
             if (kill) {
                 std::this_thread::sleep_for(startup + std::chrono::milliseconds(killDelay(random)));
-                child.signal(SIGKILL);
+                child.kill();
             }
             const int code = child.wait();
             history += std::string(resume ? " resume " : " generate ") + threads + ":" +
                        std::to_string(code);
             completed = code == 0;
-            ASSERT_TRUE(completed || (kill && code == 128 + SIGKILL))
+            ASSERT_TRUE(completed || (kill && code == kKilledExitCode))
                 << "seed " << seed << ", run " << run << history << ": " << child.err();
         }
         ASSERT_TRUE(completed) << "seed " << seed << history;

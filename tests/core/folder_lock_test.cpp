@@ -1,12 +1,8 @@
-// The lock of a folder's files: one holder at a time, inside one process as well as across
-// processes, and free again as soon as its holder releases it, dies or is killed.
+// The lock of a folder's files: one holder at a time inside one process, and free again as soon
+// as its holder releases it (across processes: cli/busy_folder_test.cpp).
 #include "core/folder_lock.hpp"
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
-#include <signal.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
 #include <cerrno>
 #include <filesystem>
@@ -14,46 +10,6 @@
 #include "support/temp_folder.hpp"
 
 using namespace tarn;
-
-namespace {
-
-// A child process that takes the lock of `folder`, tells the parent whether it holds it, then
-// either waits to be killed or runs another program (which must not inherit the lock).
-enum class ChildEnd { Killed, Execs };
-
-struct Child {
-    pid_t pid = -1;
-    bool held = false;
-};
-
-Child startHolder(const std::string& folder, ChildEnd end) {
-    int ready[2];
-    if (::pipe2(ready, O_CLOEXEC) != 0) return {};
-    const pid_t pid = ::fork();
-    if (pid == 0) {
-        ::close(ready[0]);
-        FolderLock lock = FolderLock::tryTake(folder);
-        const char held = lock.held() ? 'y' : 'n';
-        (void)!::write(ready[1], &held, 1);
-        if (end == ChildEnd::Execs) {
-            // The shell speaks once the exec is over and its closing of files is done.
-            ::dup2(ready[1], 1);
-            ::execl("/bin/sh", "sh", "-c", "echo started; exec sleep 60", nullptr);
-        }
-        ::pause();
-        ::_exit(0);
-    }
-    ::close(ready[1]);
-    char held = 'n';
-    const bool told = ::read(ready[0], &held, 1) == 1;
-    char started = 0;
-    if (end == ChildEnd::Execs)
-        while (::read(ready[0], &started, 1) == 1 && started != '\n') continue;
-    ::close(ready[0]);
-    return {pid, told && held == 'y'};
-}
-
-}  // namespace
 
 TEST(FolderLock, OneHolderAtATimeWithinAProcess) {
     test::TempFolder dir;
@@ -86,29 +42,6 @@ TEST(FolderLock, OtherFailuresAreNotABusyFolder) {
         EXPECT_FALSE(lock.busy()) << c.folder;
         EXPECT_EQ(lock.error(), c.error) << c.folder;
     }
-}
-
-TEST(FolderLock, AHolderThatIsKilledLeavesNoStaleLock) {
-    test::TempFolder dir;
-    const Child child = startHolder(dir.path(), ChildEnd::Killed);
-    ASSERT_GT(child.pid, 0);
-    EXPECT_TRUE(child.held);
-    EXPECT_TRUE(FolderLock::tryTake(dir.path()).busy()) << "the child holds it";
-    ::kill(child.pid, SIGKILL);
-    ASSERT_EQ(::waitpid(child.pid, nullptr, 0), child.pid);
-    EXPECT_TRUE(FolderLock::tryTake(dir.path()).held());
-}
-
-TEST(FolderLock, AProgramStartedByTheHolderDoesNotKeepIt) {
-    test::TempFolder dir;
-    // The child takes the lock, then runs a shell in its place: the lock goes with the exec.
-    const Child child = startHolder(dir.path(), ChildEnd::Execs);
-    ASSERT_GT(child.pid, 0);
-    EXPECT_TRUE(child.held);
-    EXPECT_TRUE(FolderLock::tryTake(dir.path()).held());
-    EXPECT_EQ(::waitpid(child.pid, nullptr, WNOHANG), 0) << "the program still runs";
-    ::kill(child.pid, SIGKILL);
-    ::waitpid(child.pid, nullptr, 0);
 }
 
 TEST(FolderLock, BusyMessageNamesTheFolder) {

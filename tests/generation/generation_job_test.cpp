@@ -79,6 +79,39 @@ TEST(GenerationJob, CompleteRunsMatchTheOracle) {
     for (int i = 0; i < 3; ++i) expectComplete(pick(random), i % 2 == 1, i % 3 + 1);
 }
 
+// High up the large primes cross off from their buckets: continued jobs near 10^12 (over 10^7
+// numbers, where the buckets come round again several times), 10^14 and the top of the range,
+// against a plain segmented sieve.
+TEST(GenerationJob, ContinuedRunsHighUpMatchAPlainSegmentedSieve) {
+    struct Case {
+        std::int64_t height, span, chunkTurns;
+        int threads;
+    };
+    const std::int64_t top = 922'337'203'685'277;
+    for (const auto& [height, span, chunkTurns, threads] :
+         std::initializer_list<Case>{{1'000'000'000'000, 10'000'000, 4999, 3},
+                                     {100'000'000'000'000, 4'000'000, 0, 2},
+                                     {top - 2'000'000, 2'000'000, 4096, 2}}) {
+        SCOPED_TRACE("height " + std::to_string(height));
+        const std::int64_t first = height - (height - 11) % 30;
+        const std::int64_t limit = std::min(first + span, top);
+        TempFolder folder;
+        writeFile(folder.path() + "primes.txt", "");
+        JobSpec spec{"", limit, threads != 2, true, first, 1000};
+        spec.threads = threads;
+        JobHooks hooks;
+        hooks.turnsPerChunk = chunkTurns;
+        const JobRun r = runIn(folder, spec, hooks);
+        ASSERT_EQ(r.result.status, Status::Completed) << r.result.error;
+        std::string expected;
+        std::int64_t serial = spec.primeCountBefore;
+        for (const std::int64_t p : plainSegment(first, limit))
+            expected += (spec.enumerated ? std::to_string(++serial) + ";" : "") +
+                        std::to_string(p) + "\r\n";
+        EXPECT_TRUE(sameText(r.results, expected));
+    }
+}
+
 // A job stopped after `turns` turns (0: a stop asked before the start, which still lets the first
 // turn run), continued in append mode and stopped again 7 turns later, then continued to its end:
 // each stop leaves whole turns, the end the file of one uninterrupted run. A stop seen after the

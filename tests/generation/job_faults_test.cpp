@@ -63,6 +63,14 @@ std::string describe(const Fault& f) {
            (f.persistent ? " from then on" : "");
 }
 
+// Windows refuses to delete or rename over the results file while a job appends to it: the job
+// goes on to its end.
+#ifdef _WIN32
+constexpr bool kResultsInUseAreKept = true;
+#else
+constexpr bool kResultsInUseAreKept = false;
+#endif
+
 // Counts the calls of one run and fails the one the fault names.
 struct Injector {
     Fault fault;
@@ -139,8 +147,10 @@ JobHooks faultyHooks(Injector& injector) {
         if (kind == Fault::Kind::Truncate)
             return std::filesystem::resize_file(injector.path, durableBytes - 3);
         const std::string records = readFile(injector.path).substr(0, durableBytes);
-        std::filesystem::remove(injector.path);
-        if (kind == Fault::Kind::Replace) writeFile(injector.path, records);
+        std::error_code refused;
+        std::filesystem::remove(injector.path, refused);
+        EXPECT_EQ(!!refused, kResultsInUseAreKept) << refused.message();
+        if (kind == Fault::Kind::Replace && !refused) writeFile(injector.path, records);
     };
     // Holds the sieving back until the checkpointer has flushed a few times, so that the
     // faults of the first flushes land inside the run whatever the machine's speed.
@@ -157,6 +167,8 @@ JobHooks faultyHooks(Injector& injector) {
 }
 
 std::string expectedMessage(const Fault& f, const std::string& folder) {
+    if (kResultsInUseAreKept && (f.kind == Fault::Kind::Delete || f.kind == Fault::Kind::Replace))
+        return "";
     switch (f.kind) {
         case Fault::Kind::Write:
             return "The file " + folder +

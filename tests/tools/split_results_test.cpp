@@ -4,7 +4,6 @@
 #include "tools/split_results.hpp"
 
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -14,6 +13,7 @@
 #include <tuple>
 #include <vector>
 
+#include "core/app_folder.hpp"
 #include "core/file_messages.hpp"
 #include "support/temp_folder.hpp"
 
@@ -65,8 +65,8 @@ std::int64_t lineEnds(const std::string& text) {
 
 // A system write that takes at most `limit` bytes at a time.
 SplitWriteFunction shortWrites(std::size_t limit) {
-    return [limit](int fd, const char* bytes, std::size_t count) -> std::ptrdiff_t {
-        return ::write(fd, bytes, std::min(count, limit));
+    return [limit](platform::File& file, const char* bytes, std::size_t count, int& error) {
+        return file.writeSome(bytes, std::min(count, limit), error);
     };
 }
 
@@ -114,9 +114,10 @@ struct SplitFixture : ::testing::Test {
 }  // namespace
 
 TEST(SplitNames, JoinTheFolderTextAsItStands) {
-    EXPECT_EQ(splitFileName(splitNamePrefix("/home/ann"), 10), "/home/ann/primes10.txt");
+    const std::string root(1, kPathSeparator);
+    EXPECT_EQ(splitFileName(splitNamePrefix("/home/ann"), 10), "/home/ann" + root + "primes10.txt");
     // A root already ends in the separator; the names then carry two.
-    EXPECT_EQ(splitFileName(splitNamePrefix("/"), 3), "//primes3.txt");
+    EXPECT_EQ(splitFileName(splitNamePrefix(root), 3), root + root + "primes3.txt");
 }
 
 TEST_F(SplitFixture, FilesJoinBackToTheInputWhateverTheCountAndTheChunking) {
@@ -232,7 +233,8 @@ TEST_F(SplitFixture, FailuresNameTheFile) {
     writeFile(results, resultsText(100, false));
     r = splitResultsFile(results, splitNamePrefix(results), 1000, StopSignal{});
     EXPECT_EQ(r.status, SplitStatus::Failed);
-    EXPECT_NE(r.message.find(results + "/primes1.txt"), std::string::npos) << r.message;
+    EXPECT_NE(r.message.find(results + kPathSeparator + "primes1.txt"), std::string::npos)
+        << r.message;
     EXPECT_NE(r.message.find("Not a directory"), std::string::npos) << r.message;
     std::filesystem::remove(results);
     std::filesystem::create_directory(results);  // opens, but cannot be read
@@ -257,14 +259,15 @@ TEST_F(SplitFixture, AWriteTheSystemRefusesFailsTheSplitAndNamesTheFile) {
         SCOPED_TRACE(f.reason.empty() ? "interrupted" : f.reason);
         std::size_t written = 0;
         bool faulted = false;
-        const SplitWriteFunction faulty = [&](int fd, const char* bytes,
-                                              std::size_t count) -> std::ptrdiff_t {
+        const SplitWriteFunction faulty = [&](platform::File& file, const char* bytes,
+                                              std::size_t count, int& error) -> std::ptrdiff_t {
             if (written > firstFile && !faulted) {
                 faulted = true;
-                errno = f.error;
+                error = f.error;
                 return f.answer;
             }
-            const ssize_t done = ::write(fd, bytes, std::min<std::size_t>(count, 4096));
+            const std::ptrdiff_t done =
+                file.writeSome(bytes, std::min<std::size_t>(count, 4096), error);
             if (done > 0) written += static_cast<std::size_t>(done);
             return done;
         };

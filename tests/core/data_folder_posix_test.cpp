@@ -1,13 +1,12 @@
 // Where a portable and an installed copy keep primes.txt and primes.ini, and which README.txt
-// "Readme" opens.
-#include "core/data_folder.hpp"
-
+// "Readme" opens, with the XDG folders of a POSIX desktop (Windows: data_folder_windows_test.cpp).
 #include <gtest/gtest.h>
 
 #include <cstdlib>
 #include <filesystem>
 #include <optional>
 
+#include "core/data_folder.hpp"
 #include "support/temp_folder.hpp"
 
 using namespace tarn;
