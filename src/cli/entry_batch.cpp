@@ -4,6 +4,7 @@
 #include <cstdio>
 #include <string_view>
 
+#include "cli/input_lines.hpp"
 #include "cli/standard_output.hpp"
 #include "core/entry.hpp"
 #include "platform/process.hpp"
@@ -24,15 +25,18 @@ public:
     bool entry(std::string_view text) {
         if (ctx_.stop.requested()) return stopped();
         const EntryResult result = ReadNumberEntry(text, '.');
-        if (!result.accepted()) {
-            if (!flush()) return false;  // keep the message next to the lines it follows
-            std::string message = result.message + '\n';
-            platform::writeAll(platform::Stream::Error, message);
-            refused_ = true;
-            return true;
-        }
+        if (!result.accepted()) return refuse(result.message);
         if (!work_(result.number->whole(), out_)) return stopped();
         return out_.size() < kFlushSize || flush();
+    }
+
+    bool refuse(const std::string& text) {
+        if (ctx_.stop.requested()) return stopped();
+        if (!flush()) return false;  // keep the message next to the lines it follows
+        std::string message = text + '\n';
+        platform::writeAll(platform::Stream::Error, message);
+        refused_ = true;
+        return true;
     }
 
     bool stopped() {
@@ -61,10 +65,15 @@ private:
     bool failed_ = false;
 };
 
-// Feeds every line of standard input to the batch. Blank lines are passed over; a carriage
-// return before the newline is dropped.
+// Feeds every line of standard input to the batch: blank lines are passed over, and a line too
+// long to be an entry is refused by its number without being held.
 void readLines(Batch& batch, Context& ctx) {
-    std::string pending;
+    InputLines lines([&batch](std::int64_t number, std::string_view line, bool tooLong) {
+        return tooLong
+                   ? batch.refuse("Line " + std::to_string(number) + " is longer than " +
+                                  std::to_string(kLongestInputLine) + " characters: passed over.")
+                   : batch.entry(line);
+    });
     char block[1 << 16];
     for (;;) {
         int error = 0;
@@ -75,28 +84,9 @@ void readLines(Batch& batch, Context& ctx) {
             return;
         }
         if (got == 0) break;
-        std::string_view data(block, static_cast<std::size_t>(got));
-        while (!data.empty()) {
-            const std::size_t newline = data.find('\n');
-            if (newline == std::string_view::npos) {
-                pending.append(data);
-                break;
-            }
-            std::string_view line = data.substr(0, newline);
-            data.remove_prefix(newline + 1);
-            if (!pending.empty()) {
-                pending.append(line);
-                line = pending;
-            }
-            if (!line.empty() && line.back() == '\r') line.remove_suffix(1);
-            const bool goOn = line.empty() || batch.entry(line);
-            pending.clear();
-            if (!goOn) return;
-        }
+        if (!lines.feed(std::string_view(block, static_cast<std::size_t>(got)))) return;
     }
-    std::string_view last = pending;
-    if (!last.empty() && last.back() == '\r') last.remove_suffix(1);
-    if (!last.empty()) batch.entry(last);
+    lines.finish();
 }
 
 }  // namespace

@@ -1,5 +1,6 @@
 #include "core/entry.hpp"
 
+#include <algorithm>
 #include <cctype>
 #include <charconv>
 #include <cmath>
@@ -9,6 +10,23 @@ namespace {
 
 bool isBlank(char c) { return c == ' ' || c == '\t'; }
 bool isDigit(char c) { return c >= '0' && c <= '9'; }
+
+// The power of ten of the first digit that is not zero in a C-form number such as "0.0026e-3":
+// its side of 1 tells a number too large for a double from one too small, whatever the sign of
+// the exponent says on its own (4000 digits and "e-3" are still far too large).
+std::int64_t decimalOrder(std::string_view normal) {
+    const std::size_t e = std::min(normal.find('e'), normal.size());
+    const std::string_view mantissa = normal.substr(0, e);
+    const std::size_t point = std::min(mantissa.find('.'), mantissa.size());
+    const std::size_t first = mantissa.find_first_not_of("0.");
+    if (first == std::string_view::npos) return 0;  // zero is never out of range
+    std::int64_t order = first < point ? static_cast<std::int64_t>(point - first) - 1
+                                       : -static_cast<std::int64_t>(first - point);
+    std::int64_t exponent = 0;
+    for (const char c : normal.substr(std::min(e + 1, normal.size())))
+        if (isDigit(c)) exponent = std::min<std::int64_t>(exponent * 10 + (c - '0'), 1'000'000'000);
+    return order + (e + 1 < normal.size() && normal[e + 1] == '-' ? -exponent : exponent);
+}
 
 }  // namespace
 
@@ -44,9 +62,7 @@ std::optional<double> parseNumericText(std::string_view text, char decimalSepara
     const auto [ptr, ec] = std::from_chars(normal.data(), normal.data() + normal.size(), value);
     if (ec == std::errc::result_out_of_range) {
         // Too large or too small for a double: keep the side it falls on.
-        std::size_t e = normal.find('e');
-        const bool tiny = e != std::string::npos && normal[e + 1] == '-';
-        value = tiny ? 0.0 : HUGE_VAL;
+        value = decimalOrder(normal) < 0 ? 0.0 : HUGE_VAL;
     } else if (ec != std::errc() || ptr != normal.data() + normal.size()) {
         return std::nullopt;
     }

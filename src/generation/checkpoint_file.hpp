@@ -4,9 +4,11 @@
 // crash at any moment leaves either the old line or the new one, never a torn file.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
+#include <string_view>
 
 namespace tarn {
 
@@ -38,7 +40,14 @@ struct CheckpointRead {
     int error = 0;                           // the system's error number when Unreadable
 };
 
+// A checkpoint line is a few dozen bytes. Only this much of a file is read, so a damaged one of
+// any size costs no more; three numbers that do not stand within it make the file malformed.
+inline constexpr std::size_t kCheckpointReadLimit = 4096;
 CheckpointRead readCheckpoint(const std::string& path);
+
+// The three numbers at the start of `text`, or nothing when they are not there; `cut` when the
+// file goes on beyond `text`.
+std::optional<Checkpoint> parseCheckpoint(std::string_view text, bool cut = false);
 
 // Writes the line durably through a temporary file and a rename. Returns an empty text on
 // success, otherwise the system's reason.

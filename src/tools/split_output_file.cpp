@@ -5,6 +5,8 @@
 
 #include <algorithm>
 #include <cstring>
+#include <filesystem>
+#include <system_error>
 #include <utility>
 
 #include "core/file_messages.hpp"
@@ -43,6 +45,14 @@ bool SplitOutputFile::dropLast(std::uint64_t count) {
     size_ -= std::min(size_, count);
     const int error = file_.truncate(size_);
     return error == 0 || fail(error);
+}
+
+bool SplitOutputFile::discard() {
+    used_ = 0;
+    if (!close()) return false;
+    std::error_code error;
+    std::filesystem::remove(name_, error);
+    return !error || fail(error.value());
 }
 
 bool SplitOutputFile::flush() {

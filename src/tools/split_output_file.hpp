@@ -28,6 +28,8 @@ public:
     bool close();
     // Takes back the last `count` bytes written (a cut record whose start already went out).
     bool dropLast(std::uint64_t count);
+    // Closes the file and removes it.
+    bool discard();
 
     // "The file <name> could not be written: <reason>."
     const std::string& error() const { return error_; }

@@ -110,7 +110,14 @@ CopyStep RecordCopier::copyRecordPiece(const char* data, std::size_t count, bool
 
 CopyStep RecordCopier::dropCutRecord(std::size_t count, bool continued) {
     cutBytes_ = count + (continued ? pieceBytes_ : 0);
-    return !continued || out_.dropLast(pieceBytes_) ? CopyStep::Go : CopyStep::Fail;
+    if (!continued) return CopyStep::Go;
+    // A file opened for the cut record alone holds none of the split's records.
+    if (inFile_ == 0 && files_ > 1) {
+        --files_;
+        if (options_.progress) options_.progress->files.store(files_, std::memory_order_relaxed);
+        return out_.discard() ? CopyStep::Go : CopyStep::Fail;
+    }
+    return out_.dropLast(pieceBytes_) ? CopyStep::Go : CopyStep::Fail;
 }
 
 SplitResult RecordCopier::finish(SplitStatus status, const std::string& failure) {

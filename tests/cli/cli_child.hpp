@@ -28,6 +28,13 @@ inline void waitForGrowth(const std::string& path, std::uintmax_t bytes) {
         std::this_thread::sleep_for(std::chrono::milliseconds(2));
 }
 
+// `count` enumerated records "1;1" .. "count;count", each ending in CR LF.
+inline std::string enumeratedRecords(int count) {
+    std::string text;
+    for (int i = 1; i <= count; ++i) text += std::to_string(i) + ";" + std::to_string(i) + "\r\n";
+    return text;
+}
+
 class CliChild : public ChildProcess {
 public:
     // Starts TARN_CLI_PATH with `args`; stdout and stderr go to files in `outputFolder`, and

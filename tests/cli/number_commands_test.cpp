@@ -22,8 +22,9 @@ const std::string kRange = "Value out of range. Value must be between 2 and 922 
 
 }  // namespace
 
-// Arguments and standard input (Windows line ends, blank lines, a refused line and a last line
-// without its newline): one line each on stdout, refusals on stderr, exit code 2 after a refusal.
+// Arguments and standard input (Windows line ends, blank lines, a refused line, a line too long
+// to be held and a last line without its newline): one line each on stdout, refusals on stderr,
+// exit code 2 after a refusal.
 TEST(CliNumbers, OneLineEachOnStdoutRefusalsOnStderr) {
     EXPECT_EQ(run({"test", "2", "2.7", "9", "1", "abc", "922337203685123"}),
               (CliRun{2,
@@ -32,11 +33,12 @@ TEST(CliNumbers, OneLineEachOnStdoutRefusalsOnStderr) {
                       kRange + "Invalid entry.\n"}));
     EXPECT_EQ(run({"factorize", "360", "2.9", "421053653"}),
               (CliRun{0, "360 = 2^3 * 3^2 * 5\n2 = 2\n421053653 = 20149 * 20897\n", ""}));
-    EXPECT_EQ(run({"test"}, "127\r\n\nx\n9\n0\n922337203685277"),
+    EXPECT_EQ(run({"test"}, "127\r\n\nx\n9\n0\n" + std::string(5000, '7') + "\n922337203685277"),
               (CliRun{2,
                       "Number 127 is prime.\nNumber 9 is not prime.\nNumber 922337203685277 is "
                       "not prime.\n",
-                      "Invalid entry.\n" + kRange}));
+                      "Invalid entry.\n" + kRange +
+                          "Line 6 is longer than 1024 characters: passed over.\n"}));
 }
 
 // Standard output on a full disk: every command that prints there ends with exit code 1 and the

@@ -16,12 +16,6 @@ using namespace tarn::test;
 
 namespace {
 
-std::string records(int count) {
-    std::string text;
-    for (int i = 1; i <= count; ++i) text += std::to_string(i) + ";" + std::to_string(i) + "\r\n";
-    return text;
-}
-
 struct SplitInterrupt : ::testing::Test {
     TempFolder data, into, scratch;
 };
@@ -41,8 +35,9 @@ TEST_F(SplitInterrupt, CtrlCStopsBetweenRecordsWithExitCodeThree) {
     // The interrupt may meet the split just before it waits for the pipe again; more records
     // wake it up until it has seen the stop and left.
     for (int more = 0; feed && !done && more <= 1000; ++more) {
-        std::fputs(more ? ("2;" + std::to_string(more) + "\r\n").c_str() : records(1500).c_str(),
-                   feed);
+        std::fputs(
+            more ? ("2;" + std::to_string(more) + "\r\n").c_str() : enumeratedRecords(1500).c_str(),
+            feed);
         std::fflush(feed);
         if (more == 0) child.interrupt();
         usleep(5000);
@@ -72,7 +67,7 @@ TEST_F(SplitInterrupt, ShowsProgressOnATerminal) {
     }
     std::FILE* feed = std::fopen(results.c_str(), "w");
     ASSERT_TRUE(feed);
-    std::fputs(records(1500).c_str(), feed);
+    std::fputs(enumeratedRecords(1500).c_str(), feed);
     std::fflush(feed);
     usleep(700000);
     std::fclose(feed);

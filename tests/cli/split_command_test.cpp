@@ -11,12 +11,6 @@ using namespace tarn::test;
 
 namespace {
 
-std::string records(int count) {
-    std::string text;
-    for (int i = 1; i <= count; ++i) text += std::to_string(i) + ";" + std::to_string(i) + "\r\n";
-    return text;
-}
-
 struct SplitCommand : ::testing::Test {
     TempFolder data, into, scratch;
 
@@ -34,15 +28,16 @@ struct SplitCommand : ::testing::Test {
 TEST_F(SplitCommand, ExitCodesAndStreams) {
     const std::string missing = "The results file " + data.path() + "primes.txt was not found.\n";
     EXPECT_EQ(split("1000"), (CliRun{1, "", missing}));
-    writeFile(data.path() + "primes.txt", records(2500));
+    writeFile(data.path() + "primes.txt", enumeratedRecords(2500));
     EXPECT_EQ(split("999.9"), (CliRun{2, "", "Minimum value is 1000 records.\n"}));
     EXPECT_FALSE(std::filesystem::exists(file(1)));
     EXPECT_EQ(split("1000.9"), (CliRun{0, "Done!!! 3 files were created.\n", ""}));
-    EXPECT_EQ(readFile(file(1)) + readFile(file(2)) + readFile(file(3)), records(2500));
-    writeFile(data.path() + "primes.txt", records(2500) + "2501;25");  // a record cut short
+    EXPECT_EQ(readFile(file(1)) + readFile(file(2)) + readFile(file(3)), enumeratedRecords(2500));
+    writeFile(data.path() + "primes.txt",
+              enumeratedRecords(2500) + "2501;25");  // a record cut short
     EXPECT_EQ(split("1000"), (CliRun{0, "Done!!! 3 files were created.\n",
                                      "The last 7 bytes of " + data.path() +
                                          "primes.txt were left out: they end without CR LF, so "
                                          "they are part of a record cut short.\n"}));
-    EXPECT_EQ(readFile(file(1)) + readFile(file(2)) + readFile(file(3)), records(2500));
+    EXPECT_EQ(readFile(file(1)) + readFile(file(2)) + readFile(file(3)), enumeratedRecords(2500));
 }
