@@ -10,18 +10,6 @@
 
 namespace tarn::platform {
 
-File::File(File&& other) noexcept
-    : handle_(std::exchange(other.handle_, kClosed)), append_(other.append_) {}
-
-File& File::operator=(File&& other) noexcept {
-    if (this != &other) {
-        close();
-        handle_ = std::exchange(other.handle_, kClosed);
-        append_ = other.append_;
-    }
-    return *this;
-}
-
 File File::open(const std::string& path, Mode mode, int& error) {
     int flags = O_CLOEXEC;
     switch (mode) {

@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "platform/files.hpp"
+#include "platform/windows_read.hpp"
 #include "platform/windows_text.hpp"
 
 namespace tarn::platform {
@@ -41,18 +42,6 @@ DWORD chunk(std::size_t size) { return static_cast<DWORD>(std::min<std::size_t>(
 
 }  // namespace
 
-File::File(File&& other) noexcept
-    : handle_(std::exchange(other.handle_, kClosed)), append_(other.append_) {}
-
-File& File::operator=(File&& other) noexcept {
-    if (this != &other) {
-        close();
-        handle_ = std::exchange(other.handle_, kClosed);
-        append_ = other.append_;
-    }
-    return *this;
-}
-
 File File::open(const std::string& path, Mode mode, int& error) {
     const std::wstring wide = widen(path);
     const bool reads = mode == Mode::Read || mode == Mode::ReadNoWait;
@@ -77,9 +66,9 @@ File File::open(const std::string& path, Mode mode, int& error) {
 
 bool File::isOpen() const { return handle_ != kClosed; }
 
-std::ptrdiff_t File::read(char* data, std::size_t size, int& error) {
+std::ptrdiff_t readHandle(void* handle, char* data, std::size_t size, int& error) {
     DWORD got = 0;
-    if (!ReadFile(native(handle_), data, chunk(size), &got, nullptr)) {
+    if (!ReadFile(handle, data, chunk(size), &got, nullptr)) {
         const DWORD code = GetLastError();
         // The writing end of a pipe has closed: the end of the input.
         if (code == ERROR_BROKEN_PIPE || code == ERROR_HANDLE_EOF) return error = 0, 0;
@@ -88,6 +77,10 @@ std::ptrdiff_t File::read(char* data, std::size_t size, int& error) {
     }
     error = 0;
     return static_cast<std::ptrdiff_t>(got);
+}
+
+std::ptrdiff_t File::read(char* data, std::size_t size, int& error) {
+    return readHandle(native(handle_), data, size, error);
 }
 
 std::ptrdiff_t File::writeSome(const char* data, std::size_t size, int& error) {

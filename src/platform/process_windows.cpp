@@ -13,6 +13,7 @@
 
 #include "platform/files.hpp"
 #include "platform/process.hpp"
+#include "platform/windows_read.hpp"
 #include "platform/windows_text.hpp"
 
 namespace tarn::platform {
@@ -83,17 +84,7 @@ int writeAll(Stream stream, std::string_view text) {
 }
 
 std::ptrdiff_t readInput(char* data, std::size_t size, int& error) {
-    DWORD got = 0;
-    const DWORD count = static_cast<DWORD>(std::min<std::size_t>(size, 1u << 30));
-    if (!ReadFile(handleOf(Stream::Input), data, count, &got, nullptr)) {
-        const DWORD code = GetLastError();
-        // The writing end of a pipe has closed: the end of the input.
-        if (code == ERROR_BROKEN_PIPE || code == ERROR_HANDLE_EOF) return error = 0, 0;
-        error = errnoOf(code);
-        return -1;
-    }
-    error = 0;
-    return static_cast<std::ptrdiff_t>(got);
+    return readHandle(handleOf(Stream::Input), data, size, error);
 }
 
 bool isTerminal(Stream stream) {
