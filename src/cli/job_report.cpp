@@ -31,13 +31,4 @@ void addThreadsOption(CLI::App& command, int& threads) {
         ->check(CLI::Range(1, 1024));
 }
 
-void addCheckpointIntervalOption(CLI::App& command, JobHooks& hooks) {
-    command
-        .add_option_function<int>(
-            "--checkpoint-interval",
-            [&hooks](int ms) { hooks.checkpointInterval = std::chrono::milliseconds(ms); })
-        ->check(CLI::Range(0, 3600000))
-        ->group("");
-}
-
 }  // namespace tarn::cli

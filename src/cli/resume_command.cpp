@@ -17,11 +17,9 @@ namespace tarn::cli {
 void registerResumeCommand(CLI::App& app, Context& ctx) {
     auto* command =
         app.add_subcommand("resume", "Continue the stopped generation job recorded in primes.ini");
-    auto hooks = std::make_shared<JobHooks>();
-    auto threads = std::make_shared<int>(0);
-    addThreadsOption(*command, *threads);
-    addCheckpointIntervalOption(*command, *hooks);
-    command->callback([&ctx, hooks, threads] {
+    auto options = std::make_shared<JobOptions>();
+    addThreadsOption(*command, options->threads);
+    command->callback([&ctx, options] {
         const auto lock = lockFolder(ctx);
         if (!lock) return;
         JobProgress progress;
@@ -33,7 +31,7 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
             line.emplace(jobSample(progress, start.resumePoint, start.limit));
         };
         const ResumeResult result =
-            runResume(ctx.folder, ctx.stop, &progress, events, *hooks, *threads);
+            runResume(ctx.folder, ctx.stop, &progress, events, *options);
         line.reset();
         switch (result.status) {
             case ResumeResult::Status::NothingToResume:

@@ -3,7 +3,7 @@
 // read in blocks of many sizes, among them blocks whose boundaries fall inside the damaged line
 // and inside the last record at or below the checkpoint. Every field of the outcome must agree,
 // the message included.
-#include "generation/results_scan.hpp"
+#include "generation/scan/results_scan.hpp"
 
 #include <gtest/gtest.h>
 
