@@ -9,7 +9,7 @@
 #include "cli/progress_line.hpp"
 #include "core/entry.hpp"
 #include "generation/generation_job.hpp"
-#include "generation/job_texts.hpp"
+#include "generation/texts.hpp"
 
 namespace tarn::cli {
 

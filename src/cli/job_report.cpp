@@ -6,7 +6,7 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/standard_output.hpp"
-#include "generation/job_texts.hpp"
+#include "generation/texts.hpp"
 
 namespace tarn::cli {
 

@@ -9,8 +9,9 @@
 #include "cli/cli_context.hpp"
 #include "cli/job_report.hpp"
 #include "cli/progress_line.hpp"
+#include "cli/texts.hpp"
 #include "generation/resume_job.hpp"
-#include "generation/resume_texts.hpp"
+#include "generation/texts.hpp"
 
 namespace tarn::cli {
 
@@ -30,8 +31,7 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
             std::cerr << kDoingResumeInfoLine << '\n';
             line.emplace(jobSample(progress, start.resumePoint, start.limit));
         };
-        const ResumeResult result =
-            runResume(ctx.folder, ctx.stop, &progress, events, *options);
+        const ResumeResult result = runResume(ctx.folder, ctx.stop, &progress, events, *options);
         line.reset();
         switch (result.status) {
             case ResumeResult::Status::NothingToResume:

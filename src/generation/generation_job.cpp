@@ -23,6 +23,7 @@
 #include "generation/config.hpp"
 #include "generation/record_formatter.hpp"
 #include "generation/results_change.hpp"
+#include "generation/texts.hpp"
 #include "generation/write_pipeline.hpp"
 
 namespace tarn {
@@ -167,8 +168,7 @@ private:
         const std::int64_t firstTurnStart = spec_.append ? spec_.firstTurn : kFirstTurnStart;
         if (firstTurnStart < kFirstTurnStart ||
             (firstTurnStart - kFirstTurnStart) % kWheelPeriod != 0) {
-            result_.error = "The job cannot start at " + std::to_string(firstTurnStart) +
-                            ", which is not the start of a wheel turn.";
+            result_.error = misplacedStartFailure(firstTurnStart);
             return false;
         }
         plan_.firstTurn = turnIndex(firstTurnStart);
@@ -187,8 +187,7 @@ private:
         try {
             large_.emplace(plan_.firstTurn, plan_.endTurn, spec_.limit, plan_.chunkTurns, threads_);
         } catch (const std::bad_alloc&) {
-            result_.error = "There is not enough memory to generate the primes up to " +
-                            std::to_string(spec_.limit) + ".";
+            result_.error = memoryFailure(spec_.limit);
             return false;
         }
         // Before the file is emptied, a checkpoint with no job to continue: a kill from here on

@@ -51,10 +51,4 @@ struct JobOptions {
 JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress = nullptr,
                  const JobOptions& options = {});
 
-// "Done!!! The results were saved in the file <path>. 25 primes found up to number 100...
-// Save the file to other location."
-std::string completionReport(const JobResult& result);
-// "INFO: 25 primes found up to number 100..."
-std::string completionInfoLine(const JobResult& result);
-
 }  // namespace tarn

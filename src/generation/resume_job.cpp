@@ -9,7 +9,7 @@
 #include "core/wheel.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/scan/results_scan.hpp"
-#include "generation/resume_texts.hpp"
+#include "generation/texts.hpp"
 #include "platform/files.hpp"
 
 namespace tarn {

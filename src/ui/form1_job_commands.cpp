@@ -3,10 +3,9 @@
 #include <QProgressBar>
 
 #include "core/entry.hpp"
-#include "generation/job_texts.hpp"
 #include "generation/resume_job.hpp"
-#include "generation/resume_texts.hpp"
 #include "generation/startup_check.hpp"
+#include "generation/texts.hpp"
 #include "ui/decimal_separator.hpp"
 #include "ui/form1.hpp"
 #include "ui/form2.hpp"

@@ -5,7 +5,7 @@
 #include "core/trial_division.hpp"
 #include "core/verdict_texts.hpp"
 #include "core/verdicts.hpp"
-#include "generation/job_texts.hpp"
+#include "generation/texts.hpp"
 #include "ui/decimal_separator.hpp"
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"

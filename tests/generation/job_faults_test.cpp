@@ -18,10 +18,10 @@
 #include "core/exception_text.hpp"
 #include "core/file_messages.hpp"
 #include "generation/generation_job.hpp"
-#include "generation/results_change.hpp"
 #include "generation/results_oracle.hpp"
 #include "generation/resume_job.hpp"
 #include "generation/sink_relay.hpp"
+#include "generation/texts.hpp"
 #include "support/temp_folder.hpp"
 
 namespace tarn {
