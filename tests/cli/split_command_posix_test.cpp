@@ -61,11 +61,12 @@ TEST_F(SplitInterrupt, CtrlCEndsABatchWaitingForStandardInputWithExitCodeThree) 
     const int feed = open(input.c_str(), O_RDWR);
     ASSERT_GE(feed, 0);
     CliChild child({"factorize"}, scratch.path(), input);
-    // More lines than one block of output holds, so that some show before it waits for more.
+    // Lines whose answers just fill a block of output (64 KiB), so that all show before it waits
+    // for more.
     std::string lines, factors;
-    for (int i = 0; i < 4000; ++i) lines += "360\n", factors += "360 = 2^3 * 3^2 * 5\n";
+    for (int i = 0; i < 3277; ++i) lines += "360\n", factors += "360 = 2^3 * 3^2 * 5\n";
     ASSERT_EQ(write(feed, lines.data(), lines.size()), static_cast<ssize_t>(lines.size()));
-    child.waitForOutput();
+    waitForGrowth(scratch.path() + "cli.out", factors.size() - 1);
     for (int tries = 0; tries < 100 && !child.finished(); ++tries) {
         if (tries % 10 == 0) child.interrupt();
         usleep(10000);
