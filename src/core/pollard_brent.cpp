@@ -105,7 +105,7 @@ std::uint64_t search(std::uint64_t n, std::uint64_t firstC, const StopSignal& st
 
 }  // namespace
 
-std::uint64_t PollardBrentFactor(std::uint64_t n, const StopSignal& stop) {
+std::uint64_t pollardBrentFactor(std::uint64_t n, const StopSignal& stop) {
     for (std::uint64_t c = 1;; c += kWalks) {
         const std::uint64_t g = search(n, c, stop);
         if (g != n) return g;

@@ -24,10 +24,6 @@ namespace tarn::ui {
 class MessageBox;
 class Shell;
 
-inline constexpr const char* kMakerWebAddress = "https://brindle.example";
-inline constexpr const char* kJobWhileSplitMessage =
-    "A split is reading the results file. Start the calculation when the split has finished.";
-
 class Form1 : public QMainWindow {
     Q_OBJECT
 

@@ -46,41 +46,34 @@ private:
 
 }  // namespace
 
-TEST(DataFolder, PortableCopyKeepsItsFilesBesideTheProgram) {
+TEST(DataFolder, PortableCopyHereInstalledOrReadOnlyCopyInTheUsersDataFolder) {
     test::TempFolder dir;
-    EXPECT_EQ(chooseDataFolder(dir.path(), surroundings(true, "/x/data", "/home/u")), dir.path());
-    // A folder that happens to be called bin, without share/ beside it, is still portable.
-    const std::string bin = dir.path() + "bin/";
-    fs::create_directory(bin);
-    EXPECT_EQ(chooseDataFolder(bin, surroundings(true, "/x/data", "/home/u")), bin);
-}
-
-TEST(DataFolder, ReadOnlyOrInstalledCopyUsesTheUsersDataFolder) {
-    test::TempFolder dir;
-    EXPECT_EQ(chooseDataFolder(dir.path(), surroundings(false, "/x/data", "/home/u")),
-              "/x/data/tarn/");
-
-    // An installed copy stays out of its prefix even where it may write (root, a user prefix).
     Prefix prefix;
-    EXPECT_TRUE(InstalledLayout(prefix.root.path() + "bin"));
-    EXPECT_EQ(chooseDataFolder(prefix.bin, surroundings(true, "/x/data", "/home/u")),
-              "/x/data/tarn/");
-}
-
-TEST(DataFolder, FollowsXdgDataHomeElseHome) {
-    const std::string program = "/opt/ro/";
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, "/x/data/", "/home/u")),
-              "/x/data/tarn/");
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, std::nullopt, "/home/u")),
-              "/home/u/.local/share/tarn/");
-    // Empty or relative XDG_DATA_HOME is invalid and ignored.
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, "", "/home/u")),
-              "/home/u/.local/share/tarn/");
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, "data", "/home/u/")),
-              "/home/u/.local/share/tarn/");
-    // Nowhere to go: the program folder, where writing then fails and is reported.
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, std::nullopt, std::nullopt)), program);
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, "rel", "")), program);
+    fs::create_directory(dir.path() + "bin");  // called bin, no share/ beside it: portable
+    const std::string ro = "/opt/ro/";
+    const struct {
+        std::string program;
+        bool writable;
+        std::optional<std::string> xdg, home;
+        std::string folder;
+    } cases[] = {
+        {dir.path(), true, "/x/data", "/home/u", dir.path()},
+        {dir.path() + "bin/", true, "/x/data", "/home/u", dir.path() + "bin/"},
+        {dir.path(), false, "/x/data", "/home/u", "/x/data/tarn/"},
+        // An installed copy stays out of its prefix even where it may write.
+        {prefix.bin, true, "/x/data/", "/home/u", "/x/data/tarn/"},
+        {ro, false, std::nullopt, "/home/u", "/home/u/.local/share/tarn/"},
+        // Empty or relative XDG_DATA_HOME is invalid and ignored.
+        {ro, false, "", "/home/u", "/home/u/.local/share/tarn/"},
+        {ro, false, "data", "/home/u/", "/home/u/.local/share/tarn/"},
+        // Nowhere to go: the program folder, where writing then fails and is reported.
+        {ro, false, std::nullopt, std::nullopt, ro},
+        {ro, false, "rel", "", ro},
+    };
+    for (const auto& c : cases)
+        EXPECT_EQ(chooseDataFolder(c.program, surroundings(c.writable, c.xdg, c.home)), c.folder)
+            << c.program << " " << c.xdg.value_or("-");
+    EXPECT_TRUE(isInstalledLayout(prefix.root.path() + "bin"));
 }
 
 TEST(DataFolder, RunningProcessCreatesTheMissingUserFolderPrivately) {
@@ -103,9 +96,8 @@ TEST(DataFolder, RunningProcessCreatesTheMissingUserFolderPrivately) {
 
 TEST(DataFolder, WritabilityComesFromTheFileSystem) {
     test::TempFolder dir;
-    EXPECT_TRUE(FolderWritable(dir.path()));
-    EXPECT_FALSE(FolderWritable(dir.path() + "missing/"));
-    // Read-only folders are covered by the install test, as an unprivileged user.
+    EXPECT_TRUE(isFolderWritable(dir.path()));
+    EXPECT_FALSE(isFolderWritable(dir.path() + "missing/"));
 }
 
 TEST(ReadmePath, ProgramFolderFirstThenInstalledDocumentation) {

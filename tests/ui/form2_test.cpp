@@ -17,6 +17,7 @@
 #include "support/temp_folder.hpp"
 #include "ui/fakes.hpp"
 #include "ui/folder_list.hpp"
+#include "ui/texts.hpp"
 
 using namespace tarn;
 using tarn::ui::Form2;
@@ -33,7 +34,6 @@ struct Form2Test : ::testing::Test {
     test::TempFolder program, documents;
     test::FakeMessageBox messages;
     test::FakeShell shell;
-    bool jobRunning = false;
     QPointer<Form2> form;
 
     void SetUp() override {
@@ -41,7 +41,7 @@ struct Form2Test : ::testing::Test {
             std::filesystem::create_directory(documents.path() + name);
         // The documents folder as the shell gives it: no trailing separator.
         shell.documents = documents.path().substr(0, documents.path().size() - 1);
-        form = new Form2(messages, shell, program.path(), [this] { return jobRunning; });
+        form = new Form2(messages, shell, program.path());
     }
     void TearDown() override { delete form.data(); }
 
@@ -66,22 +66,17 @@ struct Form2Test : ::testing::Test {
 TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
     // A killed job left part of a last record.
     test::writeFile(program.path() + "primes.txt", records(2500) + "2501;25");
-    jobRunning = true;  // a job writes the results file
-    split("1000");
-    EXPECT_EQ(messages.last().text, ui::kSplitWhileJobMessage);
-    jobRunning = false;
     {
-        // Another window or tarn-cli has a job on the files.
+        // A job of the main window, another window or tarn-cli has the files.
         const FolderLock other = FolderLock::tryTake(program.path());
         split("1000");
         EXPECT_EQ(messages.last().text, folderBusyMessage(program.path()));
-        EXPECT_EQ(text("Command2"), "Close");
     }
     split("999.9");
-    ASSERT_EQ(messages.shown.size(), 3u);
-    EXPECT_EQ(messages.last().text, "Minimum value is 1000 records.");
-    EXPECT_EQ(messages.last().title, "Info");
-    EXPECT_EQ(text("Command2"), "Close");
+    ASSERT_EQ(messages.shown.size(), 2u);
+    EXPECT_EQ(messages.last().text, kMinimumRecordsMessage);
+    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
+    EXPECT_EQ(text("Command2"), ui::kSplitCloseCaption);
     EXPECT_EQ(files(shell.documents), 0);
 
     auto* dir1 = qobject_cast<ui::FolderList*>(child("Dir1"));
@@ -96,15 +91,13 @@ TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
 
     QSignalSpy finished(form.data(), &Form2::splitFinished);
     split("1000.9");
-    EXPECT_EQ(text("Command2"), "Cancel");
+    EXPECT_EQ(text("Command2"), ui::kSplitCancelCaption);
     ASSERT_TRUE(finished.wait(10000));
-    ASSERT_EQ(messages.shown.size(), 4u);
-    EXPECT_EQ(messages.last().text, "Done!!! 3 files were created. The last 7 bytes of " +
-                                        program.path() +
-                                        "primes.txt were left out: they end without CR LF, so "
-                                        "they are part of a record cut short.");
-    EXPECT_EQ(messages.last().title, "Info");
-    EXPECT_EQ(text("Command2"), "Close");
+    ASSERT_EQ(messages.shown.size(), 3u);
+    EXPECT_EQ(messages.last().text,
+              splitDoneMessage(3) + ' ' + cutRecordNote(program.path() + "primes.txt", 7));
+    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
+    EXPECT_EQ(text("Command2"), ui::kSplitCloseCaption);
     EXPECT_EQ(files(pictures), 3);
     EXPECT_TRUE(form) << "a split that ends by itself leaves the window open";
 }
@@ -125,10 +118,12 @@ TEST_P(Form2StopTest, ClosingDuringASplitStopsIt) {
     ASSERT_NE(feed, nullptr);
     std::fputs(records(1500).c_str(), feed);
     std::fflush(feed);
-    EXPECT_EQ(text("Command2"), "Cancel");
+    EXPECT_EQ(text("Command2"), ui::kSplitCancelCaption);
     QTest::mouseClick(child("Command1"), Qt::LeftButton);
     ASSERT_EQ(messages.shown.size(), 1u);
     EXPECT_EQ(messages.last().text, ui::kSplitAlreadyRunningMessage);
+    // The split holds the folder, so that no job of any window or of tarn-cli starts on it.
+    EXPECT_TRUE(FolderLock::tryTake(program.path()).busy());
 
     form->show();
     if (GetParam())

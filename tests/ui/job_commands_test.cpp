@@ -1,16 +1,15 @@
 // Generate, Resume, start-up and closing in the window, over a fresh folder.
-#include <sys/stat.h>
-
 #include <QSignalSpy>
+#include <cerrno>
 #include <csignal>
-#include <cstdio>
 #include <filesystem>
-#include <memory>
 
 #include "core/folder_lock.hpp"
 #include "generation/checkpoint_file.hpp"
-#include "ui/form2.hpp"
+#include "generation/job_texts.hpp"
+#include "generation/resume_texts.hpp"
 #include "ui/termination_signals.hpp"
+#include "ui/texts.hpp"
 #include "window_fixture.hpp"
 
 using namespace tarn;
@@ -30,7 +29,7 @@ protected:
             press(button);
             ASSERT_EQ(messages.shown.size(), 1u) << button->text().toStdString();
             EXPECT_EQ(messages.last().text, message);
-            EXPECT_EQ(messages.last().title, "Info");
+            EXPECT_EQ(messages.last().title, ui::kInfoTitle);
         }
     }
     std::string reportFor(int primes, int limit) {
@@ -42,13 +41,13 @@ protected:
 
 TEST_F(JobCommandTest, GenerateRefusesBadLimitsThenReportsAndOpensTheResults) {
     generate("99.9");
-    EXPECT_EQ(messages.last().text, "Minimum value is 100");
-    EXPECT_EQ(messages.last().title, "Info");
+    EXPECT_EQ(messages.last().text, kMinimumMessage);
+    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
 
     generate("100.9");
     ASSERT_EQ(messages.shown.size(), 2u);
     EXPECT_EQ(messages.last().text, reportFor(25, 100));
-    EXPECT_EQ(messages.last().title, "Info");
+    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
     EXPECT_EQ(c().Label5->text(), "INFO: 25 primes found up to number 100...");
     EXPECT_TRUE(c().Label6->text().startsWith("Elapsed Time: 0:00:0"));
     EXPECT_EQ(c().ProgressBar1->value(), c().ProgressBar1->maximum());
@@ -71,15 +70,14 @@ TEST_F(JobCommandTest, StopLeavesAResumableCheckpoint) {
     c().Command1->click();
     c().Command3->click();
     ASSERT_EQ(messages.shown.size(), 2u);
-    EXPECT_EQ(messages.shown[0].title, "Info");
-    EXPECT_NE(messages.shown[0].text.find("already running"), std::string::npos);
+    EXPECT_EQ(messages.shown[0].text, ui::kJobBusy);
     c().Text2->setText("97");
     c().Command2->click();
     ASSERT_TRUE(QTest::qWaitFor([&] { return !window->numberCommandRunning(); }, 20000));
     EXPECT_EQ(messages.last().text, "Number 97 is prime.");
     press(c().Command5);
-    EXPECT_EQ(messages.last().text, "All calculations were stopped!");
-    EXPECT_EQ(messages.last().title, "Command");
+    EXPECT_EQ(messages.last().text, kAllStoppedMessage);
+    EXPECT_EQ(messages.last().title, ui::kCommandTitle);
     EXPECT_EQ(c().Label5->text(), "INFO:");
     const auto stopped = readCheckpoint(dir.path() + "primes.ini").checkpoint;
     ASSERT_TRUE(stopped);
@@ -88,6 +86,16 @@ TEST_F(JobCommandTest, StopLeavesAResumableCheckpoint) {
 }
 
 TEST_F(JobCommandTest, StartUpTellsAboutAStoppedJobThatResumeContinues) {
+    // A checkpoint that cannot be read may still name a job: start-up leaves it and says why.
+    const std::string checkpoint = dir.path() + "primes.ini";
+    std::filesystem::create_directory(checkpoint);
+    window->Form_Load();
+    ASSERT_EQ(messages.shown.size(), 1u);
+    EXPECT_EQ(messages.last().text, fileReadFailure(checkpoint, systemReason(EISDIR)));
+    EXPECT_TRUE(std::filesystem::is_directory(checkpoint));
+    std::filesystem::remove(checkpoint);
+    messages.shown.clear();
+
     window->Form_Load();
     press(c().Command3);  // nothing to resume
     EXPECT_TRUE(messages.shown.empty());
@@ -101,10 +109,8 @@ TEST_F(JobCommandTest, StartUpTellsAboutAStoppedJobThatResumeContinues) {
     writeCheckpoint(dir.path() + "primes.ini", {37, 1000, 1});
     window->Form_Load();
     ASSERT_EQ(messages.shown.size(), 1u);
-    EXPECT_EQ(messages.last().text,
-              "You've interrupted the calculations the last time you used the program. If you "
-              "wish, you can continue by pressing Resume.");
-    EXPECT_EQ(messages.last().title, "Info");
+    EXPECT_EQ(messages.last().text, kInterruptedPrompt);
+    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
     EXPECT_EQ(c().Text1->text(), "100");  // start-up changes no control
 
     press(c().Command3);
@@ -118,23 +124,8 @@ TEST_F(JobCommandTest, StartUpTellsAboutAStoppedJobThatResumeContinues) {
     writeFile(dir.path() + "primes.txt", "2\r\n");
     press(c().Command3);
     ASSERT_EQ(messages.shown.size(), 3u);
-    EXPECT_EQ(messages.last().text,
-              "Impossible to resume! Some error must have ocuured. To Resume you must Cancel the "
-              "Calculations.");
-    EXPECT_EQ(messages.last().title, "Info");
-}
-
-// A checkpoint that cannot be read (here a folder in its place) may still name a job to resume:
-// start-up leaves it and says why.
-TEST_F(JobCommandTest, StartUpTellsWhyItCannotReadTheCheckpointAndLeavesIt) {
-    const std::string checkpoint = dir.path() + "primes.ini";
-    std::filesystem::create_directory(checkpoint);
-    window->Form_Load();
-    ASSERT_EQ(messages.shown.size(), 1u);
-    EXPECT_EQ(messages.last().text,
-              "The file " + checkpoint + " could not be read: Is a directory.");
-    EXPECT_EQ(messages.last().title, "Info");
-    EXPECT_TRUE(std::filesystem::is_directory(checkpoint));
+    EXPECT_EQ(messages.last().text, kImpossibleToResumeMessage);
+    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
 }
 
 TEST_F(JobCommandTest, ClosingDuringAJobStopsItQuietlyWithACheckpoint) {
@@ -154,52 +145,21 @@ TEST_F(JobCommandTest, ClosingDuringAJobStopsItQuietlyWithACheckpoint) {
     EXPECT_EQ(stopped->interrupted, 1);
 }
 
-TEST_F(JobCommandTest, GenerateAndResumeWaitWhileAnotherJobOrASplitHasTheFiles) {
-    // A stopped job that either command would change.
+TEST_F(JobCommandTest, GenerateAndResumeWaitWhileAnotherHolderHasTheFiles) {
+    // A stopped job that either command would change; a split of this program, another window
+    // or tarn-cli holds the folder (form2_test.cpp: a running split holds it).
     const std::string stopped = "1;2\r\n2;3\r\n3;5\r\n4;7\r\n";
     writeFile(dir.path() + "primes.txt", stopped);
     writeCheckpoint(dir.path() + "primes.ini", {7, 1000, 1});
     const std::string checkpoint = readFile(dir.path() + "primes.ini");
-    const std::string busy = "Another Tarn job is working on the files in " +
-                             dir.path().substr(0, dir.path().size() - 1) +
-                             ". Wait until it ends, then try again.";
     {
-        // Another window or tarn-cli holds the folder.
         const FolderLock other = FolderLock::tryTake(dir.path());
         ASSERT_TRUE(other.held());
         c().Text1->setText("1000");
-        expectBothRefused(busy);
+        expectBothRefused(folderBusyMessage(dir.path()));
         EXPECT_EQ(results(), stopped);
         EXPECT_EQ(readFile(dir.path() + "primes.ini"), checkpoint);
     }
-
-    // The split window reads the results file, a pipe that the test feeds, so the split surely
-    // runs until the test closes the pipe.
-    TempFolder into;
-    shell.documents = into.path();
-    ASSERT_EQ(std::remove((dir.path() + "primes.txt").c_str()), 0);
-    ASSERT_EQ(mkfifo((dir.path() + "primes.txt").c_str(), 0600), 0);
-    const auto oldPipeAction = std::signal(SIGPIPE, SIG_IGN);
-    window->spllit_Click();
-    auto* split = qobject_cast<ui::Form2*>(window->splitWindow());
-    ASSERT_NE(split, nullptr);
-    QSignalSpy splitDone(split, &ui::Form2::splitFinished);
-    split->Command1_Click();
-    std::unique_ptr<std::FILE, int (*)(std::FILE*)> pipe(
-        std::fopen((dir.path() + "primes.txt").c_str(), "w"), std::fclose);
-    ASSERT_NE(pipe, nullptr);
-    std::fputs(stopped.c_str(), pipe.get());
-    std::fflush(pipe.get());
-    ASSERT_TRUE(split->splitRunning());
-    expectBothRefused(ui::kJobWhileSplitMessage);
-    EXPECT_EQ(readFile(dir.path() + "primes.ini"), checkpoint);
-    pipe.reset();  // the split reads to the end and finishes
-    ASSERT_TRUE(splitDone.count() == 1 || splitDone.wait(10000));
-    std::signal(SIGPIPE, oldPipeAction);
-    EXPECT_EQ(messages.last().text, "Done!!! 1 files were created.");
-
-    // The split has let go of the files.
-    ASSERT_EQ(std::remove((dir.path() + "primes.txt").c_str()), 0);
-    generate("100");
+    generate("100");  // the holder has let go
     EXPECT_EQ(messages.last().text, reportFor(25, 100));
 }
