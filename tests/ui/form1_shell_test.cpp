@@ -23,8 +23,7 @@ TEST_F(WindowTest, ShowResultsOpensTheFileOrAsksAboutALargeOne) {
     messages.nextAnswer = ui::MessageBox::Answer::Cancel;
     window->show_Click();
     ASSERT_EQ(messages.shown.size(), 1u);
-    EXPECT_EQ(messages.last().text, largeFileQuestion(10.01));
-    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
+    EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, largeFileQuestion(10.01)));
     EXPECT_EQ(messages.last().buttons, ui::MessageBox::Buttons::OkCancel);
     EXPECT_EQ(shell.openedWith, std::vector<std::string>{path});
     window->show_Click();  // OK opens the text editor after all
@@ -43,8 +42,7 @@ TEST_F(WindowTest, ReadmeAndTheWebLinkGoToTheShell) {
     window->readme_Click();
     EXPECT_EQ(shell.edited, std::vector<std::string>{dir.path() + "README.txt"});
     ASSERT_EQ(messages.shown.size(), 1u);
-    EXPECT_EQ(messages.last().text, "no editor");
-    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
+    EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, "no editor"));
 
     // An installed copy opens the read-me it was given instead.
     TempFolder doc;

@@ -20,14 +20,12 @@ protected:
 
 TEST_F(NumberCommandTest, TestAndFactorizeShowTheirResults) {
     run(c().Command2, "abc");
-    EXPECT_EQ(messages.last().text, kInvalidEntryMessage);
-    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
+    EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, kInvalidEntryMessage));
     EXPECT_EQ(status(), ui::kStatusIdle);
     for (const auto& [entry, verdict] : {std::pair{"9", testVerdictMessage(9, false)},
                                          std::pair{"2.7", std::string(kTwoIsPrimeMessage)}}) {
         run(c().Command2, entry);
-        EXPECT_EQ(messages.last().text, verdict);
-        EXPECT_EQ(messages.last().title, ui::kResultsTitle);
+        EXPECT_EQ(messages.lastSaid(), messages.said(ui::kResultsTitle, verdict));
         EXPECT_EQ(status(), ui::kStatusDone);
     }
     EXPECT_TRUE(c().Text4->toPlainText().isEmpty());
@@ -63,13 +61,11 @@ TEST_F(NumberCommandTest, ASecondCommandIsRefusedAndCancelStopsALongTest) {
     EXPECT_EQ(status(), ui::kStatusWorking);
     c().Command6->click();
     ASSERT_EQ(messages.shown.size(), 1u);
-    EXPECT_EQ(messages.last().title, ui::kInfoTitle);
-    EXPECT_EQ(messages.last().text, ui::kNumberCommandBusy);
+    EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, ui::kNumberCommandBusy));
     c().Command5->click();
     EXPECT_EQ(status(), ui::kStatusCalculationsStopped);
     ASSERT_TRUE(idle());
     ASSERT_EQ(messages.shown.size(), 2u);
-    EXPECT_EQ(messages.last().text, kAllStoppedMessage);
-    EXPECT_EQ(messages.last().title, ui::kCommandTitle);
+    EXPECT_EQ(messages.lastSaid(), messages.said(ui::kCommandTitle, kAllStoppedMessage));
     EXPECT_EQ(status(), ui::kStatusTestStopped);
 }
