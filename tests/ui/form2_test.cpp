@@ -2,22 +2,19 @@
 // the refusals, the worker and its final message, the stop by "Cancel" or by the title bar).
 #include "ui/form2.hpp"
 
-#include <gtest/gtest.h>
 #include <sys/stat.h>
 
 #include <QPointer>
 #include <QSignalSpy>
-#include <QTest>
 #include <csignal>
 #include <cstdio>
 #include <filesystem>
 #include <memory>
 
 #include "core/folder_lock.hpp"
-#include "support/temp_folder.hpp"
-#include "ui/fakes.hpp"
 #include "ui/folder_list.hpp"
 #include "ui/texts.hpp"
+#include "window_fixture.hpp"
 
 using namespace tarn;
 using tarn::ui::Form2;
@@ -30,10 +27,9 @@ std::string records(int count) {
     return text;
 }
 
-struct Form2Test : ::testing::Test {
-    test::TempFolder program, documents;
-    test::FakeMessageBox messages;
-    test::FakeShell shell;
+// The split window as the main window opens it, over the main window's folder.
+struct Form2Test : test::WindowTest {
+    test::TempFolder documents;
     QPointer<Form2> form;
 
     void SetUp() override {
@@ -41,9 +37,9 @@ struct Form2Test : ::testing::Test {
             std::filesystem::create_directory(documents.path() + name);
         // The documents folder as the shell gives it: no trailing separator.
         shell.documents = documents.path().substr(0, documents.path().size() - 1);
-        form = new Form2(messages, shell, program.path());
+        window->spllit_Click();
+        form = qobject_cast<Form2*>(window->splitWindow());
     }
-    void TearDown() override { delete form.data(); }
 
     QWidget* child(const char* name) const { return form->findChild<QWidget*>(name); }
     std::string text(const char* name) const {
@@ -65,12 +61,12 @@ struct Form2Test : ::testing::Test {
 
 TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
     // A killed job left part of a last record.
-    test::writeFile(program.path() + "primes.txt", records(2500) + "2501;25");
+    test::writeFile(dir.path() + "primes.txt", records(2500) + "2501;25");
     {
         // A job of the main window, another window or tarn-cli has the files.
-        const FolderLock other = FolderLock::tryTake(program.path());
+        const FolderLock other = FolderLock::tryTake(dir.path());
         split("1000");
-        EXPECT_EQ(messages.last().text, folderBusyMessage(program.path()));
+        EXPECT_EQ(messages.last().text, folderBusyMessage(dir.path()));
     }
     split("999.9");
     ASSERT_EQ(messages.shown.size(), 2u);
@@ -93,7 +89,7 @@ TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
     ASSERT_TRUE(finished.wait(10000));
     ASSERT_EQ(messages.shown.size(), 3u);
     EXPECT_EQ(messages.last().text,
-              splitDoneMessage(3) + ' ' + cutRecordNote(program.path() + "primes.txt", 7));
+              splitDoneMessage(3) + ' ' + cutRecordNote(dir.path() + "primes.txt", 7));
     EXPECT_EQ(text("Command2"), ui::kSplitCloseCaption);
     EXPECT_EQ(files(pictures), 3);
     EXPECT_TRUE(form) << "a split that ends by itself leaves the window open";
@@ -104,7 +100,7 @@ class Form2StopTest : public Form2Test, public ::testing::WithParamInterface<boo
 TEST_P(Form2StopTest, ClosingDuringASplitStopsIt) {
     // The results file is a pipe that the test feeds and keeps open, so the split surely runs
     // while the test presses its buttons, and can only end by seeing the stop.
-    const std::string results = program.path() + "primes.txt";
+    const std::string results = dir.path() + "primes.txt";
     ASSERT_EQ(mkfifo(results.c_str(), 0600), 0);
     const auto oldPipeAction = std::signal(SIGPIPE, SIG_IGN);
     split("1000");
@@ -121,7 +117,7 @@ TEST_P(Form2StopTest, ClosingDuringASplitStopsIt) {
     ASSERT_EQ(messages.shown.size(), 1u);
     EXPECT_EQ(messages.last().text, ui::kSplitAlreadyRunningMessage);
     // The split holds the folder, so that no job of any window or of tarn-cli starts on it.
-    EXPECT_TRUE(FolderLock::tryTake(program.path()).busy());
+    EXPECT_TRUE(FolderLock::tryTake(dir.path()).busy());
 
     form->show();
     if (GetParam())
