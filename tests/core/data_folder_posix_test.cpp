@@ -1,8 +1,9 @@
 // Where a copy keeps primes.txt and primes.ini, and which README.txt "Readme" opens, with the XDG
 // folders of a POSIX desktop (Windows: data_folder_windows_test.cpp). The install test runs the
-// installed and portable programs themselves, and sees the private data folder created.
+// installed and portable programs themselves.
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <filesystem>
 #include <optional>
 
@@ -19,6 +20,17 @@ struct Prefix {
     test::TempFolder root;
     std::string bin = root.path() + "bin/", doc = root.path() + "share/doc/tarn/";
     Prefix() { fs::create_directories(bin), fs::create_directories(doc); }
+};
+
+// Sets an environment variable for one test and puts the old value back.
+struct ScopedEnv {
+    const char* name;
+    std::optional<std::string> old;
+    ScopedEnv(const char* n, const char* value) : name(n) {
+        if (const char* was = std::getenv(n)) old = was;
+        value ? setenv(n, value, 1) : unsetenv(n);
+    }
+    ~ScopedEnv() { old ? setenv(name, old->c_str(), 1) : unsetenv(name); }
 };
 
 }  // namespace
@@ -52,6 +64,19 @@ TEST(DataFolder, PortableCopyHereInstalledOrReadOnlyCopyInTheUsersDataFolder) {
     }
     EXPECT_TRUE(isFolderWritable(dir.path()));
     EXPECT_FALSE(isFolderWritable(dir.path() + "missing/"));
+}
+
+TEST(DataFolder, RunningProcessCreatesTheMissingUserFolderPrivately) {
+    Prefix prefix;
+    test::TempFolder data;
+    const ScopedEnv xdg("XDG_DATA_HOME", (data.path() + "deep/er").c_str());
+    const std::string folder = dataFolder(prefix.bin);
+    EXPECT_EQ(folder, data.path() + "deep/er/tarn/");
+    EXPECT_EQ(fs::status(folder).permissions() & fs::perms::all, fs::perms::owner_all);
+    EXPECT_EQ(dataFolder(prefix.bin), folder);  // an existing folder is simply used
+    const ScopedEnv unset("XDG_DATA_HOME", nullptr), home("HOME", data.path().c_str());
+    EXPECT_EQ(dataFolder(prefix.bin), data.path() + ".local/share/tarn/");
+    EXPECT_TRUE(fs::is_directory(data.path() + ".local/share/tarn"));
 }
 
 TEST(ReadmePath, ProgramFolderFirstThenInstalledDocumentation) {
