@@ -1,7 +1,7 @@
 // Test, Factorize and "Cancel all calculations". The test and the factorization run on a
 // worker; one of them at a time, so that two results never race into the status line.
+#include <QSemaphore>
 #include <memory>
-#include <semaphore>
 
 #include "core/entry.hpp"
 #include "core/factorization.hpp"
@@ -43,7 +43,7 @@ void Form1::Command2_Click() {
     numberRunning_ = true;
     // TestPrime2 clears the stop request as it starts: the command returns once the worker has
     // taken the test up, so that a "Cancel all calculations" right after the press finds it.
-    auto started = std::make_shared<std::binary_semaphore>(0);
+    auto started = std::make_shared<QSemaphore>();
     runOnWorker(
         this,
         [this, number, started] {
