@@ -7,8 +7,8 @@
 #include "cli/cli_context.hpp"
 #include "cli/job_report.hpp"
 #include "cli/progress_line.hpp"
-#include "core/entry.hpp"
 #include "generation/generation_job.hpp"
+#include "generation/limit_entry.hpp"
 #include "generation/texts.hpp"
 
 namespace tarn::cli {
@@ -29,14 +29,9 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
                        "Write records as serial number;prime (5;11)");
     addThreadsOption(*generate, options->job.threads);
     generate->callback([&ctx, options] {
-        const EntryResult entry = ReadNumberEntry(options->limit);
+        const EntryResult entry = readLimitEntry(options->limit);
         if (!entry.accepted()) {
             std::cerr << entry.message << '\n';
-            ctx.exitCode = kRefused;
-            return;
-        }
-        if (const auto refusal = checkGenerationMinimum(entry.number->whole())) {
-            std::cerr << *refusal << '\n';
             ctx.exitCode = kRefused;
             return;
         }

@@ -2,15 +2,10 @@
 
 #include <algorithm>
 
-#include "core/file_messages.hpp"
+#include "core/texts.hpp"
 #include "generation/generation_job.hpp"
 
 namespace tarn {
-
-std::optional<std::string> checkGenerationMinimum(std::int64_t whole) {
-    if (whole < kGenerationMinimum) return std::string(kMinimumMessage);
-    return std::nullopt;
-}
 
 namespace {
 // After a complete run the candidate stands above the limit; the report names the limit.

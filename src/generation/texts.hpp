@@ -4,7 +4,6 @@
 #pragma once
 
 #include <cstdint>
-#include <optional>
 #include <string>
 #include <string_view>
 
@@ -16,9 +15,6 @@ inline constexpr std::int64_t kGenerationMinimum = 100;
 inline constexpr std::string_view kMinimumMessage = "Minimum value is 100";
 // Told when the user stops a job (or the Test command, which shares the window's stop).
 inline constexpr std::string_view kAllStoppedMessage = "All calculations were stopped!";
-
-// "Minimum value is 100" for a whole number below 100, nothing otherwise.
-std::optional<std::string> checkGenerationMinimum(std::int64_t whole);
 
 struct JobResult;
 // "Done!!! The results were saved in the file <path>. 25 primes found up to number 100...

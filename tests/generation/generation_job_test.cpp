@@ -14,7 +14,7 @@
 #include <stdexcept>
 #include <thread>
 
-#include "core/file_messages.hpp"
+#include "core/texts.hpp"
 #include "generation/results_oracle.hpp"
 #include "generation/sink_relay.hpp"
 #include "support/temp_folder.hpp"

@@ -4,7 +4,7 @@
 
 #include <filesystem>
 
-#include "core/file_messages.hpp"
+#include "core/texts.hpp"
 #include "generation/startup_check.hpp"
 #include "support/temp_folder.hpp"
 

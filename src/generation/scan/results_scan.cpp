@@ -29,8 +29,8 @@
 #include <optional>
 #include <string_view>
 
-#include "core/file_messages.hpp"
 #include "core/miller_rabin.hpp"
+#include "core/texts.hpp"
 #include "generation/scan/fast_run.hpp"
 #include "generation/scan/line_check.hpp"
 #include "generation/scan/keys.hpp"
