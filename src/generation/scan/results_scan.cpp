@@ -32,8 +32,8 @@
 #include "core/miller_rabin.hpp"
 #include "core/texts.hpp"
 #include "generation/scan/fast_run.hpp"
-#include "generation/scan/line_check.hpp"
 #include "generation/scan/keys.hpp"
+#include "generation/scan/line_check.hpp"
 #include "platform/files.hpp"
 
 namespace tarn {
