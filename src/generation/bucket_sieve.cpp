@@ -231,17 +231,18 @@ void BucketSieve::crossOff(Group& group, std::uint64_t chunk, std::uint8_t* byte
             const Entry e = *at;
             const std::uint64_t a = e & 0xffffffff;
             std::uint64_t turn = e >> 38;
-            std::uint32_t step = (e >> 32) & 63;
+            const std::uint32_t residue = (e >> 32) & 56;
+            std::uint32_t wheel = (e >> 32) & 7;
             // Filed here, the next multiple lies in this chunk; primes whose shortest step
-            // spans a chunk have no other.
+            // spans a chunk have no other. The next position comes by arithmetic, not from the
+            // table, so that the walk waits on no load from one multiple to the next.
             do {
-                const WalkStep& walk = kWalk[step];
-                const std::uint8_t bit = walk.bit;
-                step = walk.next;
-                const std::uint64_t next = turn + a * walk.step + walk.carry;
-                bytes[turn] |= bit;
-                turn = next;
+                const WalkStep& walk = kWalk[residue | wheel];
+                bytes[turn] |= walk.bit;
+                turn += a * walk.step + walk.carry;
+                wheel = (wheel + 1) & 7;
             } while (!kOnce && turn < length);
+            const std::uint32_t step = residue | wheel;
             std::uint64_t ahead;
             if constexpr (kShift) {
                 ahead = turn >> shift;
