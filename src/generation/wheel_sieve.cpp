@@ -153,18 +153,36 @@ void WheelSieve::placePatterns() {
 void WheelSieve::sieveNext(std::uint8_t* bytes, std::size_t turns) {
     orPattern(bytes, turns, pattern(), patternAt_);
     const auto& pairs = pairPatterns();
-    for (std::size_t i = 0; i < kPairPatterns; ++i)
-        orPattern(bytes, turns, pairs[i], pairAt_[i]);
+    for (std::size_t i = 0; i < kPairPatterns; ++i) orPattern(bytes, turns, pairs[i], pairAt_[i]);
     for (std::int64_t t = turn_; t < 2 && t < turn_ + static_cast<std::int64_t>(turns); ++t)
         bytes[t - turn_] &=
             static_cast<std::uint8_t>(~kPatternPrimesInTurn[static_cast<std::size_t>(t)]);
     const std::uint64_t length = turns;
     for (Medium& s : medium_) {
+        // The eight progressions lie within p bytes of each other, so they go on together, eight
+        // stores a round and one loop end a prime, and each has one multiple left at most after
+        // the last whole round.
         const std::uint64_t p = s.p;
+        const auto [n0, n1, n2, n3, n4, n5, n6, n7] = s.next;
+        const std::uint64_t last = std::max({n0, n1, n2, n3, n4, n5, n6, n7});
+        std::uint64_t base = 0;
+        for (; base + last < length; base += p) {
+            std::uint8_t* const at = bytes + base;
+            at[n0] |= 0x01;
+            at[n1] |= 0x02;
+            at[n2] |= 0x04;
+            at[n3] |= 0x08;
+            at[n4] |= 0x10;
+            at[n5] |= 0x20;
+            at[n6] |= 0x40;
+            at[n7] |= 0x80;
+        }
         for (int b = 0; b < 8; ++b) {
-            std::uint64_t j = s.next[b];
-            const auto mask = static_cast<std::uint8_t>(1u << b);
-            for (; j < length; j += p) bytes[j] |= mask;
+            std::uint64_t j = base + s.next[b];
+            if (j < length) {
+                bytes[j] |= static_cast<std::uint8_t>(1u << b);
+                j += p;
+            }
             s.next[b] = j - length;
         }
     }
