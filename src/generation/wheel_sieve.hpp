@@ -4,9 +4,9 @@
 // turns is small enough to stay in the first-level cache. The multiples of 7 to 19 come from a
 // pattern that repeats every 7 * 11 * 13 * 17 * 19 turns, those of 23 to 61 from a pattern for
 // each pair of them. The other primes hit every segment:
-// those below 2^13 cross off along eight fixed-bit progressions of step p bytes (a tight loop per
-// progression), the rest walk their multiples along the wheel in one loop, which ends once per
-// segment rather than eight times. The few thousand of them make a state of a few hundred
+// those below 2^13 cross off along eight fixed-bit progressions of step p bytes (taken together,
+// eight stores a round), the rest walk their multiples along the wheel in one loop, which ends once
+// per segment rather than eight times. The few thousand of them make a state of a few hundred
 // kilobytes, one per sieving thread. The larger primes wait in the buckets of bucket_sieve.hpp.
 #pragma once
 
