@@ -248,8 +248,8 @@ void BucketSieve::crossOff(Group& group, std::uint64_t span, std::uint8_t* bytes
             const std::uint32_t residue = (e >> 32) & 56;
             std::uint32_t wheel = (e >> 32) & 7;
             // Filed here, the next multiple lies in this span; primes whose shortest step
-            // spans a span have no other. The next position comes by arithmetic, not from the
-            // table, so that the walk waits on no load from one multiple to the next.
+            // is a span or longer have no other. The next position comes by arithmetic, not from
+            // the table, so that the walk waits on no load from one multiple to the next.
             do {
                 const WalkStep& walk = kWalk[residue | wheel];
                 bytes[turn] |= walk.bit;

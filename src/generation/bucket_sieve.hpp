@@ -69,7 +69,7 @@ private:
         std::vector<std::unique_ptr<std::byte[]>> storage;
     };
 
-    // A prime whose shortest step (2p / 30 turns) spans a span.
+    // A prime whose shortest step (2p / 30 turns) is a span or longer.
     bool once(std::uint32_t a) const { return 2 * std::uint64_t{a} >= spanTurns_; }
     void activate(Group& group, std::uint64_t horizon);
     template <bool kOnce, bool kShift>
