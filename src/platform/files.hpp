@@ -94,6 +94,10 @@ private:
 // one: written to `path` + ".tmp", synced, renamed over `path`, and the rename made durable.
 int replaceFileDurably(const std::string& path, std::string_view content);
 
+// The end of replaceFileDurably, one per system: when `error` is 0, moves the synced `temporary`
+// over `path` and returns once the new name is on the disk; `temporary` is removed on any failure.
+int finishReplace(const std::string& temporary, const std::string& path, int error);
+
 // The identity of the file at `path`; ENOENT when nothing is there.
 int pathIdentity(const std::string& path, FileIdentity& identity);
 

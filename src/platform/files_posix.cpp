@@ -122,15 +122,7 @@ int syncFolderOf(const std::string& path) {
 
 }  // namespace
 
-int replaceFileDurably(const std::string& path, std::string_view content) {
-    const std::string temporary = path + ".tmp";
-    int error = 0;
-    File file = File::open(temporary, File::Mode::Create, error);
-    if (error != 0) return error;
-    std::size_t written = 0;
-    error = file.writeAll(content.data(), content.size(), written);
-    if (error == 0) error = file.syncData();
-    if (const int closed = file.close(); error == 0) error = closed;
+int finishReplace(const std::string& temporary, const std::string& path, int error) {
     if (error == 0 && ::rename(temporary.c_str(), path.c_str()) != 0) error = errno;
     if (error != 0) {
         ::unlink(temporary.c_str());

@@ -154,15 +154,7 @@ int File::close() {
     return CloseHandle(native(std::exchange(handle_, kClosed))) ? 0 : lastErrno();
 }
 
-int replaceFileDurably(const std::string& path, std::string_view content) {
-    const std::string temporary = path + ".tmp";
-    int error = 0;
-    File file = File::open(temporary, File::Mode::Create, error);
-    if (error != 0) return error;
-    std::size_t written = 0;
-    error = file.writeAll(content.data(), content.size(), written);
-    if (error == 0) error = file.syncData();
-    if (const int closed = file.close(); error == 0) error = closed;
+int finishReplace(const std::string& temporary, const std::string& path, int error) {
     const std::wstring from = widen(temporary);
     // Write-through: the call returns once the new name is on the disk.
     if (error == 0 && !MoveFileExW(from.c_str(), widen(path).c_str(),
