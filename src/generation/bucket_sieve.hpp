@@ -1,6 +1,6 @@
 // The large primes of the generation sieve, from kMediumPrimeBound up to the square root of the
 // limit: up to 1.9 million of them, most of which have no multiple at all in a chunk of turns.
-// Each waits in the bucket of the chunk that holds its next multiple, so a chunk costs the
+// Each waits in the bucket of the span that holds its next multiple, so a span costs the
 // multiples that fall in it, not the count of primes. One instance serves every sieving thread.
 // The primes are dealt into groups; each group crosses off the chunks one after the other, in
 // the order the threads claim them, so different groups can work on different chunks at once.
@@ -8,7 +8,8 @@
 // The buckets are kept by spans of several chunks, about kSpanTurns, crossed off into a span
 // of sieve of each group's own and copied out chunk by chunk: a prime below the span's length
 // is then visited once a span rather than once a chunk. The groups' spans are staggered by a
-// chunk each, so that a chunk finds most groups with a span already crossed off.
+// chunk each, so that different groups cross off their spans on different chunks and the threads
+// stay evenly loaded.
 #pragma once
 
 #include <cstdint>
