@@ -7,9 +7,9 @@
 #include "cli/cli_context.hpp"
 #include "cli/job_report.hpp"
 #include "cli/progress_line.hpp"
-#include "core/entry.hpp"
 #include "generation/generation_job.hpp"
 #include "generation/job_texts.hpp"
+#include "generation/limit_entry.hpp"
 
 namespace tarn::cli {
 
@@ -34,14 +34,9 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
     addThreadsOption(*generate, options->threads);
     addCheckpointIntervalOption(*generate, options->hooks);
     generate->callback([&ctx, options] {
-        const EntryResult entry = ReadNumberEntry(options->limit);
+        const EntryResult entry = readLimitEntry(options->limit);
         if (!entry.accepted()) {
             std::cerr << entry.message << '\n';
-            ctx.exitCode = kRefused;
-            return;
-        }
-        if (const auto refusal = checkGenerationMinimum(entry.number->whole())) {
-            std::cerr << *refusal << '\n';
             ctx.exitCode = kRefused;
             return;
         }

@@ -8,8 +8,7 @@
 #include "cli/entry_batch.hpp"
 #include "core/factorization.hpp"
 #include "core/miller_rabin.hpp"
-#include "core/verdict_texts.hpp"
-#include "core/verdicts.hpp"
+#include "core/texts.hpp"
 
 namespace tarn::cli {
 

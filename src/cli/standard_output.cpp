@@ -5,7 +5,7 @@
 #include <string>
 
 #include "cli/cli_context.hpp"
-#include "core/file_messages.hpp"
+#include "core/texts.hpp"
 #include "platform/process.hpp"
 
 namespace tarn::cli {

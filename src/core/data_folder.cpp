@@ -40,11 +40,11 @@ bool usableBase(const std::optional<std::string>& folder) {
 
 }  // namespace
 
-bool FolderWritable(const std::string& folder) {
+bool isFolderWritable(const std::string& folder) {
     return platform::folderWritable(folderPath(folder));
 }
 
-bool InstalledLayout(const std::string& programFolder) {
+bool isInstalledLayout(const std::string& programFolder) {
     const fs::path bin = folderPath(programFolder);
     std::error_code ec;
     return bin.filename() == "bin" && fs::is_directory(bin / TARN_DATAROOT_FROM_BIN, ec);
@@ -52,7 +52,7 @@ bool InstalledLayout(const std::string& programFolder) {
 
 Surroundings currentSurroundings() {
     const platform::UserDataConvention& convention = platform::userDataConvention();
-    return {FolderWritable, environment(convention.dataVariable),
+    return {isFolderWritable, environment(convention.dataVariable),
             environment(convention.homeVariable)};
 }
 
@@ -71,7 +71,7 @@ std::string userDataFolder(const Surroundings& env) {
 
 std::string chooseDataFolder(const std::string& programFolder, const Surroundings& env) {
     const bool writable = env.folderWritable && env.folderWritable(programFolder);
-    if (writable && !InstalledLayout(programFolder)) return programFolder;
+    if (writable && !isInstalledLayout(programFolder)) return programFolder;
     const std::string user = userDataFolder(env);
     return user.empty() ? programFolder : user;
 }

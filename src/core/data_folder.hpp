@@ -22,10 +22,10 @@ struct Surroundings {
 Surroundings currentSurroundings();
 
 // Whether this process may create files in the folder (effective ids; read-only mounts count).
-bool FolderWritable(const std::string& folder);
+bool isFolderWritable(const std::string& folder);
 
 // Whether the program folder is the "bin" folder of an installation prefix.
-bool InstalledLayout(const std::string& programFolder);
+bool isInstalledLayout(const std::string& programFolder);
 
 // The user's data folder for Tarn with one trailing separator: $XDG_DATA_HOME/tarn, else
 // $HOME/.local/share/tarn (Windows: %LOCALAPPDATA%\Tarn). A relative XDG_DATA_HOME is ignored, as

@@ -8,6 +8,7 @@
 #include <string_view>
 
 #include "core/number.hpp"
+#include "core/texts.hpp"
 
 namespace tarn {
 
@@ -16,10 +17,6 @@ namespace tarn {
 inline constexpr std::int64_t kUpperEntryWhole = 922337203685277;
 inline constexpr double kLowerEntryBound = 2.0;
 inline constexpr double kUpperEntryBound = static_cast<double>(kUpperEntryWhole);
-
-inline constexpr std::string_view kInvalidEntryMessage = "Invalid entry.";
-inline constexpr std::string_view kOutOfRangeMessage =
-    "Value out of range. Value must be between 2 and 922 337 203 685 277.";
 
 // Plain decimal text: surrounding blanks, an optional sign, digits with an optional fraction
 // (after the locale's separator or a point), an optional exponent. Returns nothing when the

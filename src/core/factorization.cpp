@@ -87,7 +87,7 @@ bool splitLarge(std::uint64_t m, PrimeCollector& out, const StopSignal& stop) {
             for (unsigned i = 0; i < k; ++i) pending[count++] = root;
             continue;
         }
-        const std::uint64_t f = PollardBrentFactor(v, stop);
+        const std::uint64_t f = pollardBrentFactor(v, stop);
         if (f == 0) return false;
         pending[count++] = f;
         pending[count++] = v / f;

@@ -2,8 +2,6 @@
 
 #include <cerrno>
 
-#include "platform/path_separator.hpp"
-
 namespace tarn {
 
 FolderLock FolderLock::tryTake(const std::string& folder) {
@@ -13,13 +11,5 @@ FolderLock FolderLock::tryTake(const std::string& folder) {
 }
 
 bool FolderLock::busy() const { return error_ == EWOULDBLOCK; }
-
-std::string folderBusyMessage(const std::string& folder) {
-    std::string shown = folder;
-    while (shown.size() > 1 && (shown.back() == '/' || shown.back() == platform::kPathSeparator))
-        shown.pop_back();
-    return "Another Tarn job is working on the files in " + shown +
-           ". Wait until it ends, then try again.";
-}
 
 }  // namespace tarn

@@ -5,6 +5,7 @@
 
 #include <string>
 
+#include "core/texts.hpp"
 #include "platform/folder_hold.hpp"
 
 namespace tarn {
@@ -30,8 +31,5 @@ private:
     platform::FolderHold hold_;
     int error_ = 0;
 };
-
-// "Another Tarn job is working on the files in <folder>. Wait until it ends, then try again."
-std::string folderBusyMessage(const std::string& folder);
 
 }  // namespace tarn

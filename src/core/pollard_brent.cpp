@@ -5,6 +5,7 @@
 #include <array>
 #include <bit>
 
+#include "core/config.hpp"
 #include "core/montgomery.hpp"
 
 namespace tarn {
@@ -44,14 +45,8 @@ private:
     std::uint64_t negInv_;
 };
 
-// Steps per gcd and per look at the stop: a binary gcd costs as much as a few dozen products,
-// and a batch that overshoots is walked again one step at a time, so neither cost shows.
-constexpr int kBatch = 128;
 // Where every walk starts; any residue serves.
 constexpr std::uint64_t kWalkStart = 2;
-// Walks that run side by side: each step of one walk waits on the last, so a few independent
-// walks fill the multiplier, and the first of them to find a factor ends the search sooner.
-constexpr int kWalks = 2;
 
 struct Walk {
     std::uint64_t c, x, y, saved, product;
@@ -62,8 +57,9 @@ struct Walk {
 std::uint64_t search(std::uint64_t n, std::uint64_t firstC, const StopSignal& stop) {
     const LazyMontgomery mont(n);
     const std::uint64_t fourN = 4 * n;
-    std::array<Walk, kWalks> walks;
-    for (int w = 0; w < kWalks; ++w) walks[w] = {firstC + w, kWalkStart, kWalkStart, kWalkStart, 1};
+    std::array<Walk, kPollardWalks> walks;
+    for (int w = 0; w < kPollardWalks; ++w)
+        walks[w] = {firstC + w, kWalkStart, kWalkStart, kWalkStart, 1};
     auto step = [&](std::uint64_t v, std::uint64_t c) { return mont.mul(v, v) + c; };
     // x and y lie in [0, 4n), so this is a positive residue of x - y below 8n.
     auto difference = [&](std::uint64_t x, std::uint64_t y) { return x + fourN - y; };
@@ -73,9 +69,9 @@ std::uint64_t search(std::uint64_t n, std::uint64_t firstC, const StopSignal& st
         for (std::uint64_t i = 0; i < r; ++i) {
             for (Walk& w : walks) w.y = step(w.y, w.c);
         }
-        for (std::uint64_t k = 0; k < r; k += kBatch) {
+        for (std::uint64_t k = 0; k < r; k += kPollardBatch) {
             if (stop.requested()) return 0;
-            const std::uint64_t steps = r - k < kBatch ? r - k : kBatch;
+            const std::uint64_t steps = r - k < kPollardBatch ? r - k : kPollardBatch;
             for (Walk& w : walks) w.saved = w.y;
             for (std::uint64_t i = 0; i < steps; ++i) {
                 for (Walk& w : walks) {
@@ -105,8 +101,8 @@ std::uint64_t search(std::uint64_t n, std::uint64_t firstC, const StopSignal& st
 
 }  // namespace
 
-std::uint64_t PollardBrentFactor(std::uint64_t n, const StopSignal& stop) {
-    for (std::uint64_t c = 1;; c += kWalks) {
+std::uint64_t pollardBrentFactor(std::uint64_t n, const StopSignal& stop) {
+    for (std::uint64_t c = 1;; c += kPollardWalks) {
         const std::uint64_t g = search(n, c, stop);
         if (g != n) return g;
     }

@@ -12,6 +12,6 @@ namespace tarn {
 // A factor of the odd composite n (below 2^58), strictly between 1 and n; a walk that meets n
 // itself is started again with another constant. Returns 0 when `stop` was seen; it is read
 // once per batch of steps.
-std::uint64_t PollardBrentFactor(std::uint64_t n, const StopSignal& stop);
+std::uint64_t pollardBrentFactor(std::uint64_t n, const StopSignal& stop);
 
 }  // namespace tarn

@@ -17,9 +17,4 @@ enum TestCode : int { kComposite = 0, kPrime = 1, kStopped = 2 };
 // Numbers below 1 are reported composite.
 int TestPrime2(std::int64_t n, StopSignal& stop);
 
-// The same test without clearing the stop request first. The window runs it on a worker and
-// clears the request on its own thread when the command starts, so that a stop pressed before
-// the worker gets going still counts.
-int trialDivisionTest(std::int64_t n, const StopSignal& stop);
-
 }  // namespace tarn

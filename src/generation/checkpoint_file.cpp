@@ -7,8 +7,8 @@
 #include <climits>
 #include <cstring>
 
-#include "core/file_messages.hpp"
 #include "core/number.hpp"
+#include "core/texts.hpp"
 #include "platform/files.hpp"
 
 namespace tarn {

@@ -15,8 +15,8 @@
 #include <vector>
 
 #include "core/exception_text.hpp"
-#include "core/file_messages.hpp"
 #include "core/file_names.hpp"
+#include "core/texts.hpp"
 #include "core/wheel.hpp"
 #include "generation/bucket_sieve.hpp"
 #include "generation/chunk_producer.hpp"

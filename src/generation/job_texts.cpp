@@ -8,11 +8,6 @@
 
 namespace tarn {
 
-std::optional<std::string> checkGenerationMinimum(std::int64_t whole) {
-    if (whole < kGenerationMinimum) return std::string(kMinimumMessage);
-    return std::nullopt;
-}
-
 namespace {
 // After a complete run the candidate stands above the limit; the report names the limit.
 std::int64_t reportedBound(const JobResult& r) { return std::min(r.candidate, r.limit); }

@@ -14,7 +14,4 @@ inline constexpr std::string_view kMinimumMessage = "Minimum value is 100";
 // Told when the user stops a job (or the Test command, which shares the window's stop).
 inline constexpr std::string_view kAllStoppedMessage = "All calculations were stopped!";
 
-// "Minimum value is 100" for a whole number below 100, nothing otherwise.
-std::optional<std::string> checkGenerationMinimum(std::int64_t whole);
-
 }  // namespace tarn

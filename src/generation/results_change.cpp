@@ -4,8 +4,8 @@
 #include <fstream>
 #include <optional>
 
-#include "core/file_messages.hpp"
 #include "core/path_text.hpp"
+#include "core/texts.hpp"
 #include "core/wheel.hpp"
 
 namespace tarn {

@@ -29,8 +29,8 @@
 #include <optional>
 #include <string_view>
 
-#include "core/file_messages.hpp"
 #include "core/miller_rabin.hpp"
+#include "core/texts.hpp"
 #include "generation/results_fast_run.hpp"
 #include "generation/results_line_check.hpp"
 #include "generation/results_scan_keys.hpp"

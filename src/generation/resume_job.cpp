@@ -4,8 +4,8 @@
 
 #include "core/entry.hpp"
 #include "core/exception_text.hpp"
-#include "core/file_messages.hpp"
 #include "core/file_names.hpp"
+#include "core/texts.hpp"
 #include "core/wheel.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/results_scan.hpp"

@@ -2,8 +2,8 @@
 // user actually resumes.
 #include "generation/startup_check.hpp"
 
-#include "core/file_messages.hpp"
 #include "core/file_names.hpp"
+#include "core/texts.hpp"
 #include "generation/checkpoint_file.hpp"
 
 namespace tarn {

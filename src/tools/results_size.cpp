@@ -4,7 +4,6 @@
 
 #include <filesystem>
 
-#include "core/number.hpp"
 #include "core/path_text.hpp"
 
 namespace tarn {
@@ -25,14 +24,6 @@ double sizeFigure(std::uint64_t bytes) {
 }
 
 bool isLargeFigure(double figure) { return figure > kLargeFigure; }
-
-std::string megabyteText(double figure) { return doubleText(figure); }
-
-std::string largeFileQuestion(double figure) {
-    return "The file is bigger than 10 MB (" + megabyteText(figure) +
-           " MB). Do you still want to open it with Notepad? If you cancel, you may choose the "
-           "program to open it.";
-}
 
 std::optional<std::uint64_t> fileLength(const std::string& path) {
     std::error_code ec;

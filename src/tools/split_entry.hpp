@@ -7,14 +7,11 @@
 #include <string_view>
 
 #include "core/entry.hpp"
+#include "tools/texts.hpp"
 
 namespace tarn {
 
 inline constexpr std::int64_t kMinimumRecordsPerFile = 1000;
-
-inline constexpr std::string_view kMinimumRecordsMessage = "Minimum value is 1000 records.";
-inline constexpr std::string_view kRecordsOutOfRangeMessage =
-    "Value out of range. Value must be between 1000 and 922 337 203 685 477.";
 
 // Accepted: a whole Number of at least 1000 ("1000.9" gives 1000). Refused with
 // "Invalid entry." (not numeric, empty), "Minimum value is 1000 records." (below 1000 after

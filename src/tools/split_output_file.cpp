@@ -9,7 +9,7 @@
 #include <system_error>
 #include <utility>
 
-#include "core/file_messages.hpp"
+#include "core/texts.hpp"
 
 namespace tarn {
 

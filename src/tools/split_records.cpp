@@ -41,7 +41,7 @@ RecordCopier::RecordCopier(std::string namePrefix, std::int64_t recordsPerFile,
       out_(options.writeSome) {}
 
 bool RecordCopier::stopHere() {
-    if (options_.onCheckpoint) options_.onCheckpoint(copied_);
+    if (options_.onStopPoint) options_.onStopPoint(copied_);
     return stop_.requested();
 }
 

@@ -10,9 +10,10 @@
 #include <vector>
 
 #include "core/app_folder.hpp"
-#include "core/file_messages.hpp"
 #include "core/number.hpp"
+#include "core/texts.hpp"
 #include "tools/split_records.hpp"
+#include "tools/texts.hpp"
 
 namespace tarn {
 namespace {
@@ -26,7 +27,7 @@ SplitResult copyRecords(const std::string& resultsPath, RecordCopier& copier,
     platform::File in = platform::File::open(resultsPath, platform::File::Mode::Read, err);
     if (err != 0) {
         return {SplitStatus::Failed, 0,
-                err == ENOENT ? "The results file " + resultsPath + " was not found."
+                err == ENOENT ? resultsNotFoundMessage(resultsPath)
                               : fileReadFailure(resultsPath, systemReason(err))};
     }
     if (copier.openFirst() != CopyStep::Go) return copier.finish(SplitStatus::Failed);
@@ -96,15 +97,6 @@ SplitResult splitResultsFile(const std::string& resultsPath, const std::string& 
                              const SplitOptions& options) {
     RecordCopier copier(namePrefix, std::max<std::int64_t>(recordsPerFile, 1), stop, options);
     return copyRecords(resultsPath, copier, options);
-}
-
-std::string splitDoneMessage(std::int64_t files) {
-    return "Done!!!" + signedText(Number::fromWhole(files)) + " files were created.";
-}
-
-std::string cutRecordNote(const std::string& resultsPath, std::uint64_t bytes) {
-    return "The last " + std::to_string(bytes) + " bytes of " + resultsPath +
-           " were left out: they end without CR LF, so they are part of a record cut short.";
 }
 
 }  // namespace tarn

@@ -12,15 +12,10 @@
 
 #include "core/stop_signal.hpp"
 #include "platform/files.hpp"
+#include "tools/config.hpp"
+#include "tools/texts.hpp"
 
 namespace tarn {
-
-// Bytes read at once: enough that the system calls cost little next to the copy, and a constant
-// memory whatever the file's size.
-inline constexpr std::size_t kSplitBlockSize = std::size_t{1} << 20;
-// Small pieces for one output file are gathered up to this many bytes; pieces of half of it
-// or more go to the system directly.
-inline constexpr std::size_t kSplitStagingSize = std::size_t{64} << 10;
 
 // Writes up to count bytes to the file like the system's write: the bytes taken, or -1 with the
 // error number in `error`.
@@ -52,7 +47,7 @@ struct SplitOptions {
     std::size_t blockSize = kSplitBlockSize;  // bytes read at once; small values only in tests
     // Called at every point where the split looks at the stop signal, with the number of
     // records copied so far; lets a caller show progress or raise the stop at an exact record.
-    std::function<void(std::int64_t)> onCheckpoint;
+    std::function<void(std::int64_t)> onStopPoint;
     // Takes the place of the system's write for the output files (empty: the system's own);
     // lets tests take a few bytes at a time or fail at a chosen byte.
     SplitWriteFunction writeSome;
@@ -68,10 +63,5 @@ struct SplitOptions {
 SplitResult splitResultsFile(const std::string& resultsPath, const std::string& namePrefix,
                              std::int64_t recordsPerFile, const StopSignal& stop,
                              const SplitOptions& options = {});
-
-// "Done!!!", the signed text of the file count and " files were created.".
-std::string splitDoneMessage(std::int64_t files);
-// Says that the bytes after the last line end of the results file were left out.
-std::string cutRecordNote(const std::string& resultsPath, std::uint64_t bytes);
 
 }  // namespace tarn

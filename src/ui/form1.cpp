@@ -4,9 +4,11 @@
 
 #include "core/app_folder.hpp"
 #include "core/file_names.hpp"
+#include "ui/config.hpp"
 #include "ui/designed_font.hpp"
 #include "ui/message_box.hpp"
 #include "ui/shell/shell.hpp"
+#include "ui/texts.hpp"
 #include "ui_form1.h"
 
 namespace tarn::ui {
@@ -29,7 +31,8 @@ Form1::Form1(MessageBox& messages, Shell& shell, std::string folder, QWidget* pa
     // The designed boxes are 9 pixels wide: draw the indicator to fit them.
     for (QWidget* box : {static_cast<QWidget*>(ui_->Check1), static_cast<QWidget*>(ui_->Check2)})
         box->setStyleSheet("QCheckBox::indicator { width: 9px; height: 9px; }");
-    ui_->Command4->setText(QStringLiteral("Click here: Visit Brindle at ") + kMakerWebAddress);
+    ui_->Command4->setText(QString::fromUtf8(kWebLinkCaption) +
+                           QString::fromUtf8(kMakerWebAddress));
     setFixedSize(sizeHint());
     ui_->Text1->setFocus();
 
@@ -44,14 +47,14 @@ Form1::Form1(MessageBox& messages, Shell& shell, std::string folder, QWidget* pa
     connect(ui_->exit, &QAction::triggered, this, &Form1::exit_Click);
     connect(ui_->readme, &QAction::triggered, this, &Form1::readme_Click);
 
-    progressTimer_.setInterval(250);
+    progressTimer_.setInterval(kProgressInterval);
     connect(&progressTimer_, &QTimer::timeout, this, &Form1::refreshJobDisplay);
 }
 
 Form1::~Form1() { delete splitWindow_; }
 
 void Form1::reportLaunch(const std::string& failure) {
-    if (!failure.empty()) messages_.show(failure, "Info", MessageBox::Buttons::Ok);
+    if (!failure.empty()) messages_.show(failure, std::string(kInfoTitle), MessageBox::Buttons::Ok);
 }
 
 void Form1::readme_Click() {
@@ -59,7 +62,7 @@ void Form1::readme_Click() {
     if (FileExists(path)) reportLaunch(shell_.openInTextEditor(path));
 }
 
-void Form1::Command4_Click() { reportLaunch(shell_.openUrl(kMakerWebAddress)); }
+void Form1::Command4_Click() { reportLaunch(shell_.openUrl(std::string(kMakerWebAddress))); }
 
 void Form1::exit_Click() { close(); }
 
@@ -86,8 +89,7 @@ void Form1::requestClose() {
 std::string elapsedTimeText(std::chrono::seconds elapsed) {
     const long long total = elapsed.count() < 0 ? 0 : elapsed.count();
     char text[64];
-    std::snprintf(text, sizeof text, "Elapsed Time: %lld:%02lld:%02lld", total / 3600,
-                  total / 60 % 60, total % 60);
+    std::snprintf(text, sizeof text, kElapsedTimeFormat, total / 3600, total / 60 % 60, total % 60);
     return text;
 }
 

@@ -24,10 +24,16 @@ namespace tarn::ui {
 class MessageBox;
 class Shell;
 
-inline constexpr const char* kMakerWebAddress = "https://brindle.example";
-inline constexpr const char* kJobWhileSplitMessage =
-    "A split is reading the results file. Start the calculation when the split has finished.";
-
+// The designed controls keep their designed names (form1.ui):
+//   Frame1 "Generate Primes "       Text1 limit ("Up to", Label1), Check1 "Enumerate results"
+//                                   (Label3), Check2 "Open results when finished" (Label4),
+//                                   Label5 information line, Label6 elapsed time,
+//                                   ProgressBar1, Command1 Generate, Command3 Resume
+//   Frame2 "Test Prime or Factorize" Text2 number ("Number", Label2), Command2 Test,
+//                                   Command6 Factorize, Text4 factorization, Label7 status line
+//   Command5 "Cancel all calculations", Command4 the web link
+//   Menus: main (show "Show results", spllit "Split Result File", exit "Exit Tarn"),
+//          help (readme "Readme")
 class Form1 : public QMainWindow {
     Q_OBJECT
 

@@ -2,28 +2,21 @@
 // times a second and reports its outcome once the worker has finished with the files.
 #include <QProgressBar>
 
-#include "core/entry.hpp"
 #include "generation/job_texts.hpp"
+#include "generation/limit_entry.hpp"
 #include "generation/resume_job.hpp"
 #include "generation/resume_texts.hpp"
 #include "generation/startup_check.hpp"
+#include "ui/config.hpp"
 #include "ui/decimal_separator.hpp"
 #include "ui/form1.hpp"
-#include "ui/form2.hpp"
 #include "ui/message_box.hpp"
-#include "ui/window_texts.hpp"
+#include "ui/texts.hpp"
 #include "ui/worker.hpp"
 #include "ui_form1.h"
 
 namespace tarn::ui {
-namespace {
-
-constexpr const char* kJobBusy =
-    "A calculation is already running. Stop it with \"Cancel all calculations\" first.";
-// The bar's own range is an int; the job's range is scaled onto it.
-constexpr int kBarSteps = 1'000'000;
-
-}  // namespace
+namespace {}  // namespace
 
 void Form1::Form_Load() {
     closingRequested_ = false;
@@ -35,17 +28,12 @@ void Form1::Form_Load() {
 
 bool Form1::refuseWhileJobRuns() {
     if (!jobRunning_) return false;
-    messages_.show(kJobBusy, std::string(kInfoTitle));
+    messages_.show(std::string(kJobBusy), std::string(kInfoTitle));
     return true;
 }
 
 // Takes the folder's lock for a job or resume, or tells why the files are busy.
 bool Form1::lockJobFolder() {
-    const auto* split = qobject_cast<const Form2*>(splitWindow_.data());
-    if (split && split->splitRunning()) {
-        messages_.show(kJobWhileSplitMessage, std::string(kInfoTitle));
-        return false;
-    }
     FolderLock lock = FolderLock::tryTake(folder_);
     // Only another holder refuses; a folder that cannot be locked is left to the job's own
     // file errors.
@@ -60,16 +48,12 @@ bool Form1::lockJobFolder() {
 void Form1::Command1_Click() {
     if (refuseWhileJobRuns()) return;
     const bool enumerated = ui_->Check1->isChecked();
-    const EntryResult entry = ReadNumberEntry(ui_->Text1->text().toStdString(), decimalSeparator());
+    const EntryResult entry = readLimitEntry(ui_->Text1->text().toStdString(), decimalSeparator());
     if (!entry.accepted()) {
         messages_.show(entry.message, std::string(kInfoTitle));
         return;
     }
     const std::int64_t limit = entry.number->whole();
-    if (const auto refusal = checkGenerationMinimum(limit)) {
-        messages_.show(*refusal, std::string(kInfoTitle));
-        return;
-    }
     if (!lockJobFolder()) return;
     jobStop_.clear();
     jobRunning_ = true;

@@ -1,24 +1,22 @@
 // Test, Factorize and "Cancel all calculations". The test and the factorization run on a
 // worker; one of them at a time, so that two results never race into the status line.
+#include <QSemaphore>
+#include <memory>
+
 #include "core/entry.hpp"
 #include "core/factorization.hpp"
+#include "core/texts.hpp"
 #include "core/trial_division.hpp"
-#include "core/verdict_texts.hpp"
-#include "core/verdicts.hpp"
 #include "generation/job_texts.hpp"
 #include "ui/decimal_separator.hpp"
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"
-#include "ui/window_texts.hpp"
+#include "ui/texts.hpp"
 #include "ui/worker.hpp"
 #include "ui_form1.h"
 
 namespace tarn::ui {
 namespace {
-
-constexpr const char* kNumberCommandBusy =
-    "A test or factorization is still running. Wait for its result, or stop it with "
-    "\"Cancel all calculations\".";
 
 QString text(std::string_view s) { return QString::fromUtf8(s.data(), static_cast<int>(s.size())); }
 
@@ -26,7 +24,7 @@ QString text(std::string_view s) { return QString::fromUtf8(s.data(), static_cas
 
 void Form1::Command2_Click() {
     if (numberRunning_) {
-        messages_.show(kNumberCommandBusy, std::string(kInfoTitle));
+        messages_.show(std::string(kNumberCommandBusy), std::string(kInfoTitle));
         return;
     }
     const EntryResult entry = ReadNumberEntry(ui_->Text2->text().toStdString(), decimalSeparator());
@@ -42,11 +40,18 @@ void Form1::Command2_Click() {
         ui_->Label7->setText(text(kStatusDone));
         return;
     }
-    numberStop_.clear();
     numberRunning_ = true;
+    // TestPrime2 clears the stop request as it starts: the command returns once the worker has
+    // taken the test up, so that a "Cancel all calculations" right after the press finds it.
+    auto started = std::make_shared<QSemaphore>();
     runOnWorker(
-        this, [this, number] { return trialDivisionTest(number, numberStop_); },
+        this,
+        [this, number, started] {
+            started->release();
+            return TestPrime2(number, numberStop_);
+        },
         [this, number](int code) { finishTest(number, code); });
+    started->acquire();
 }
 
 void Form1::finishTest(std::int64_t number, int code) {
@@ -66,7 +71,7 @@ void Form1::finishTest(std::int64_t number, int code) {
 
 void Form1::Command6_Click() {
     if (numberRunning_) {
-        messages_.show(kNumberCommandBusy, std::string(kInfoTitle));
+        messages_.show(std::string(kNumberCommandBusy), std::string(kInfoTitle));
         return;
     }
     numberStop_.clear();

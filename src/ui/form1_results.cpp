@@ -6,6 +6,7 @@
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"
 #include "ui/shell/shell.hpp"
+#include "ui/texts.hpp"
 #include "ui_form1.h"
 
 namespace tarn::ui {
@@ -21,7 +22,8 @@ void Form1::OpenResultsFile(OpenMode mode, const std::string& path) {
         figure = sizeFigure(fileLength(path).value_or(0));
     MessageBox::Answer answer = MessageBox::Answer::Ok;
     if (isLargeFigure(figure))
-        answer = messages_.show(largeFileQuestion(figure), "Info", MessageBox::Buttons::OkCancel);
+        answer = messages_.show(largeFileQuestion(figure), std::string(kInfoTitle),
+                                MessageBox::Buttons::OkCancel);
     if (mode == OpenMode::OnRequest && !FileExists(path)) return;
     reportLaunch(answer == MessageBox::Answer::Ok ? shell_.openInTextEditor(path)
                                                   : shell_.showOpenWith(path));

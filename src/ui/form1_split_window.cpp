@@ -6,7 +6,7 @@ namespace tarn::ui {
 
 void Form1::spllit_Click() {
     if (!splitWindow_) {
-        auto* window = new Form2(messages_, shell_, folder_, [this] { return jobRunning_; });
+        auto* window = new Form2(messages_, shell_, folder_);
         window->setWindowIcon(windowIcon());
         splitWindow_ = window;
     }

@@ -7,6 +7,7 @@
 #include "tools/split_entry.hpp"
 #include "ui/decimal_separator.hpp"
 #include "ui/folder_list.hpp"
+#include "ui/texts.hpp"
 #include "ui_form2.h"
 
 namespace tarn::ui {
@@ -24,14 +25,12 @@ QFont dialogFont(const QFont& base) {
 
 }  // namespace
 
-Form2::Form2(MessageBox& messages, Shell& shell, std::string programFolder,
-             std::function<bool()> jobRunning, QWidget* parent)
+Form2::Form2(MessageBox& messages, Shell& shell, std::string dataFolder, QWidget* parent)
     : QWidget(parent, Qt::Window),
       ui_(std::make_unique<Ui::Form2>()),
       messages_(messages),
       shell_(shell),
-      programFolder_(std::move(programFolder)),
-      jobRunning_(std::move(jobRunning)) {
+      dataFolder_(std::move(dataFolder)) {
     setFont(dialogFont(font()));
     ui_->setupUi(this);
     setFixedSize(408, 221);
@@ -64,34 +63,30 @@ void Form2::Dir1_Change() { ui_->Label1->setText(ui_->Dir1->path()); }
 
 void Form2::Command1_Click() {
     // The window is modeless and nothing is disabled, so a split can be asked for while one
-    // runs, or while a job of the main window is still writing the results file.
+    // runs; a job on the same files (here or elsewhere) is kept off by the folder's lock.
     if (running_) {
-        messages_.show(kSplitAlreadyRunningMessage, "Info");
+        messages_.show(std::string(kSplitAlreadyRunningMessage), std::string(kInfoTitle));
         return;
     }
-    if (jobRunning_ && jobRunning_()) {
-        messages_.show(kSplitWhileJobMessage, "Info");
-        return;
-    }
-    const std::string input = resultsFilePath(programFolder_);
+    const std::string input = resultsFilePath(dataFolder_);
     const std::string prefix = splitNamePrefix(ui_->Label1->text().toStdString());
     const EntryResult count =
         parseRecordsPerFile(ui_->Text1->text().toStdString(), decimalSeparator());
     if (!count.accepted()) {
-        messages_.show(count.message, "Info");
+        messages_.show(count.message, std::string(kInfoTitle));
         return;
     }
-    // Another window or tarn-cli may have a job on the same files.
-    FolderLock lock = FolderLock::tryTake(programFolder_);
+    // A job of the main window, another window or tarn-cli may be on the same files.
+    FolderLock lock = FolderLock::tryTake(dataFolder_);
     if (lock.busy()) {
-        messages_.show(folderBusyMessage(programFolder_), "Info");
+        messages_.show(folderBusyMessage(dataFolder_), std::string(kInfoTitle));
         return;
     }
     splitLock_ = std::move(lock);
 
     splitStopRequested_ = std::make_shared<StopSignal>();
     running_ = true;
-    ui_->Command2->setText(QStringLiteral("Cancel"));
+    ui_->Command2->setText(QString::fromUtf8(kSplitCancelCaption));
     worker_.setFuture(QtConcurrent::run(
         [input, prefix, perFile = count.number->whole(), stop = splitStopRequested_] {
             return splitResultsFile(input, prefix, perFile, *stop);
@@ -120,15 +115,14 @@ void Form2::splitEnded() {
     const SplitResult result = worker_.result();
     running_ = false;
     splitLock_.release();
-    ui_->Command2->setText(QStringLiteral("Close"));
-    if (result.status == SplitStatus::Failed)
-        messages_.show(result.message, "Info");
-    else if (result.cutBytes > 0)
-        messages_.show(splitDoneMessage(result.files) + ' ' +
-                           cutRecordNote(resultsFilePath(programFolder_), result.cutBytes),
-                       "Info");
-    else
-        messages_.show(splitDoneMessage(result.files), "Info");
+    ui_->Command2->setText(QString::fromUtf8(kSplitCloseCaption));
+    std::string message = result.message;
+    if (result.status != SplitStatus::Failed) {
+        message = splitDoneMessage(result.files);
+        if (result.cutBytes > 0)
+            message += ' ' + cutRecordNote(resultsFilePath(dataFolder_), result.cutBytes);
+    }
+    messages_.show(message, std::string(kInfoTitle));
     Q_EMIT splitFinished();
     if (closeWhenDone_ && testAttribute(Qt::WA_DeleteOnClose)) deleteLater();
 }

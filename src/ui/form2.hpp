@@ -5,7 +5,6 @@
 
 #include <QFutureWatcher>
 #include <QWidget>
-#include <functional>
 #include <memory>
 #include <string>
 
@@ -21,21 +20,13 @@ class Form2;
 
 namespace tarn::ui {
 
-inline constexpr const char* kSplitWhileJobMessage =
-    "A calculation is writing the results file. Split it when the calculation has finished.";
-inline constexpr const char* kSplitAlreadyRunningMessage =
-    "A split is already running. Wait until it has finished, or press Cancel.";
-
 class Form2 : public QWidget {
     Q_OBJECT
 public:
-    // jobRunning tells whether a generation or resume job of the main window is writing the
-    // results file. The window deletes itself once closed and its split has ended.
-    Form2(MessageBox& messages, Shell& shell, std::string programFolder,
-          std::function<bool()> jobRunning, QWidget* parent = nullptr);
+    // `dataFolder` holds the results file. The window deletes itself once closed and its split
+    // has ended.
+    Form2(MessageBox& messages, Shell& shell, std::string dataFolder, QWidget* parent = nullptr);
     ~Form2() override;
-
-    bool splitRunning() const { return running_; }
 
 public Q_SLOTS:
     void Form_Load();
@@ -56,8 +47,7 @@ private:
     std::unique_ptr<Ui::Form2> ui_;
     MessageBox& messages_;
     Shell& shell_;
-    std::string programFolder_;
-    std::function<bool()> jobRunning_;
+    std::string dataFolder_;
 
     // SplitStopRequested: shared with the worker, which may outlive a press of "Cancel".
     std::shared_ptr<StopSignal> splitStopRequested_;

@@ -5,6 +5,7 @@
 #include <atomic>
 
 #include "platform/process.hpp"
+#include "ui/config.hpp"
 
 namespace tarn::ui {
 namespace {
@@ -24,7 +25,7 @@ void closeOnTerminationSignals(QWidget& window) {
     QObject::connect(poll, &QTimer::timeout, &window, [&window] {
         if (g_requested.exchange(false)) window.close();
     });
-    poll->start(100);
+    poll->start(kSignalPollInterval);
 }
 
 }  // namespace tarn::ui

@@ -7,13 +7,15 @@
 #include <QtConcurrent/QtConcurrentRun>
 #include <type_traits>
 
+#include "ui/config.hpp"
+
 namespace tarn::ui {
 
 // A pool of its own: a job, a test and a split may all run at once on two cores.
 inline QThreadPool& workerPool() {
     static QThreadPool* pool = [] {
         auto* p = new QThreadPool;
-        p->setMaxThreadCount(6);
+        p->setMaxThreadCount(kWorkerThreads);
         return p;
     }();
     return *pool;

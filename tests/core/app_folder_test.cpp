@@ -4,7 +4,6 @@
 #include <gtest/gtest.h>
 
 #include <filesystem>
-#include <fstream>
 
 #include "support/temp_folder.hpp"
 
@@ -23,16 +22,14 @@ TEST(AppFolder, EndsWithExactlyOneSeparator) {
 
 TEST(FileExists, OnlyNormalVisibleFilesCount) {
     test::TempFolder dir;
-    const std::string file = dir.path() + "primes.txt";
-    std::ofstream(file) << "2\r\n";
-    std::ofstream(dir.path() + ".hidden") << "x";
+    test::writeFile(dir.path() + "primes.txt", "2\r\n");
+    test::writeFile(dir.path() + ".hidden", "x");
     std::filesystem::create_directory(dir.path() + "sub");
-
-    EXPECT_TRUE(FileExists(file));
-    EXPECT_FALSE(FileExists(""));
-    EXPECT_FALSE(FileExists(dir.path()));          // trailing separator
-    EXPECT_FALSE(FileExists(dir.path() + "sub"));  // a folder
-    EXPECT_FALSE(FileExists(dir.path() + "missing.txt"));
-    EXPECT_FALSE(FileExists(dir.path() + ".hidden"));
-    EXPECT_FALSE(FileExists(dir.path() + "primes.txt/x"));  // a query that fails
+    EXPECT_TRUE(FileExists(dir.path() + "primes.txt"));
+    // Nothing, the folder with its separator, a folder, a missing file, a hidden file, a query
+    // that fails.
+    for (const std::string& path :
+         {std::string(), dir.path(), dir.path() + "sub", dir.path() + "missing.txt",
+          dir.path() + ".hidden", dir.path() + "primes.txt/x"})
+        EXPECT_FALSE(FileExists(path)) << path;
 }

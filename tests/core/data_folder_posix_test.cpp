@@ -1,5 +1,6 @@
-// Where a portable and an installed copy keep primes.txt and primes.ini, and which README.txt
-// "Readme" opens, with the XDG folders of a POSIX desktop (Windows: data_folder_windows_test.cpp).
+// Where a copy keeps primes.txt and primes.ini, and which README.txt "Readme" opens, with the XDG
+// folders of a POSIX desktop (Windows: data_folder_windows_test.cpp). The install test runs the
+// installed and portable programs themselves.
 #include <gtest/gtest.h>
 
 #include <cstdlib>
@@ -14,108 +15,76 @@ namespace fs = std::filesystem;
 
 namespace {
 
-Surroundings surroundings(bool writable, std::optional<std::string> xdg,
-                          std::optional<std::string> home) {
-    return {[writable](const std::string&) { return writable; }, std::move(xdg), std::move(home)};
-}
-
 // A prefix as `cmake --install` lays it out: bin/ beside share/doc/tarn/.
 struct Prefix {
     test::TempFolder root;
-    std::string bin = root.path() + "bin/";
-    std::string doc = root.path() + "share/doc/tarn/";
-    Prefix() {
-        fs::create_directories(bin);
-        fs::create_directories(doc);
-    }
+    std::string bin = root.path() + "bin/", doc = root.path() + "share/doc/tarn/";
+    Prefix() { fs::create_directories(bin), fs::create_directories(doc); }
 };
 
 // Sets an environment variable for one test and puts the old value back.
-class ScopedEnv {
-public:
-    ScopedEnv(const char* name, const char* value) : name_(name) {
-        if (const char* old = std::getenv(name)) old_ = old;
-        value ? setenv(name, value, 1) : unsetenv(name);
+struct ScopedEnv {
+    const char* name;
+    std::optional<std::string> old;
+    ScopedEnv(const char* n, const char* value) : name(n) {
+        if (const char* was = std::getenv(n)) old = was;
+        value ? setenv(n, value, 1) : unsetenv(n);
     }
-    ~ScopedEnv() { old_ ? setenv(name_, old_->c_str(), 1) : unsetenv(name_); }
-
-private:
-    const char* name_;
-    std::optional<std::string> old_;
+    ~ScopedEnv() { old ? setenv(name, old->c_str(), 1) : unsetenv(name); }
 };
 
 }  // namespace
 
-TEST(DataFolder, PortableCopyKeepsItsFilesBesideTheProgram) {
+TEST(DataFolder, PortableCopyHereInstalledOrReadOnlyCopyInTheUsersDataFolder) {
     test::TempFolder dir;
-    EXPECT_EQ(chooseDataFolder(dir.path(), surroundings(true, "/x/data", "/home/u")), dir.path());
-    // A folder that happens to be called bin, without share/ beside it, is still portable.
-    const std::string bin = dir.path() + "bin/";
-    fs::create_directory(bin);
-    EXPECT_EQ(chooseDataFolder(bin, surroundings(true, "/x/data", "/home/u")), bin);
-}
-
-TEST(DataFolder, ReadOnlyOrInstalledCopyUsesTheUsersDataFolder) {
-    test::TempFolder dir;
-    EXPECT_EQ(chooseDataFolder(dir.path(), surroundings(false, "/x/data", "/home/u")),
-              "/x/data/tarn/");
-
-    // An installed copy stays out of its prefix even where it may write (root, a user prefix).
     Prefix prefix;
-    EXPECT_TRUE(InstalledLayout(prefix.root.path() + "bin"));
-    EXPECT_EQ(chooseDataFolder(prefix.bin, surroundings(true, "/x/data", "/home/u")),
-              "/x/data/tarn/");
-}
-
-TEST(DataFolder, FollowsXdgDataHomeElseHome) {
-    const std::string program = "/opt/ro/";
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, "/x/data/", "/home/u")),
-              "/x/data/tarn/");
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, std::nullopt, "/home/u")),
-              "/home/u/.local/share/tarn/");
-    // Empty or relative XDG_DATA_HOME is invalid and ignored.
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, "", "/home/u")),
-              "/home/u/.local/share/tarn/");
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, "data", "/home/u/")),
-              "/home/u/.local/share/tarn/");
-    // Nowhere to go: the program folder, where writing then fails and is reported.
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, std::nullopt, std::nullopt)), program);
-    EXPECT_EQ(chooseDataFolder(program, surroundings(false, "rel", "")), program);
+    fs::create_directory(dir.path() + "bin");  // called bin, no share/ beside it: portable
+    const std::string ro = "/opt/ro/", home = "/home/u/.local/share/tarn/";
+    const struct {
+        std::string program;
+        bool writable;
+        std::optional<std::string> xdg, home;
+        std::string folder;
+    } cases[] = {
+        {dir.path() + "bin/", true, "/x/data", "/home/u", dir.path() + "bin/"},
+        {dir.path(), false, "/x/data", "/home/u", "/x/data/tarn/"},
+        // An installed copy stays out of its prefix even where it may write.
+        {prefix.bin, true, "/x/data/", "/home/u", "/x/data/tarn/"},
+        {ro, false, std::nullopt, "/home/u", home},
+        // Empty or relative XDG_DATA_HOME is invalid and ignored.
+        {ro, false, "", "/home/u", home},
+        {ro, false, "data", "/home/u/", home},
+        // Nowhere to go: the program folder, where writing then fails and is reported.
+        {ro, false, std::nullopt, std::nullopt, ro},
+        {ro, false, "rel", "", ro},
+    };
+    for (const auto& c : cases) {
+        const Surroundings env{[&c](const std::string&) { return c.writable; }, c.xdg, c.home};
+        EXPECT_EQ(chooseDataFolder(c.program, env), c.folder) << c.program << c.xdg.value_or("-");
+    }
+    EXPECT_TRUE(isFolderWritable(dir.path()));
+    EXPECT_FALSE(isFolderWritable(dir.path() + "missing/"));
 }
 
 TEST(DataFolder, RunningProcessCreatesTheMissingUserFolderPrivately) {
     Prefix prefix;
     test::TempFolder data;
-    const std::string xdg = data.path() + "deep/er";
-    ScopedEnv env("XDG_DATA_HOME", xdg.c_str());
-
+    const ScopedEnv xdg("XDG_DATA_HOME", (data.path() + "deep/er").c_str());
     const std::string folder = dataFolder(prefix.bin);
-    EXPECT_EQ(folder, xdg + "/tarn/");
-    ASSERT_TRUE(fs::is_directory(folder));
+    EXPECT_EQ(folder, data.path() + "deep/er/tarn/");
     EXPECT_EQ(fs::status(folder).permissions() & fs::perms::all, fs::perms::owner_all);
     EXPECT_EQ(dataFolder(prefix.bin), folder);  // an existing folder is simply used
-
-    ScopedEnv unset("XDG_DATA_HOME", nullptr);
-    ScopedEnv home("HOME", data.path().c_str());
+    const ScopedEnv unset("XDG_DATA_HOME", nullptr), home("HOME", data.path().c_str());
     EXPECT_EQ(dataFolder(prefix.bin), data.path() + ".local/share/tarn/");
     EXPECT_TRUE(fs::is_directory(data.path() + ".local/share/tarn"));
-}
-
-TEST(DataFolder, WritabilityComesFromTheFileSystem) {
-    test::TempFolder dir;
-    EXPECT_TRUE(FolderWritable(dir.path()));
-    EXPECT_FALSE(FolderWritable(dir.path() + "missing/"));
-    // Read-only folders are covered by the install test, as an unprivileged user.
 }
 
 TEST(ReadmePath, ProgramFolderFirstThenInstalledDocumentation) {
     Prefix prefix;
     // Neither: the program folder's name, which does not exist, so "Readme" does nothing.
     EXPECT_EQ(readmePath(prefix.bin), prefix.bin + "README.txt");
-
     test::writeFile(prefix.doc + "README.txt", "installed\n");
     EXPECT_EQ(readmePath(prefix.bin), prefix.doc + "README.txt");  // no "bin/.." left in it
-
     test::writeFile(prefix.bin + "README.txt", "portable\n");
     EXPECT_EQ(readmePath(prefix.bin), prefix.bin + "README.txt");
 }

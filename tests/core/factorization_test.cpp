@@ -35,18 +35,13 @@ FactorList factors(std::int64_t n) {
 
 // The list is a factorization of n: ascending primes, each once, multiplying back to n.
 void expectSound(std::int64_t n) {
-    const FactorList list = factors(n);
-    ASSERT_FALSE(list.empty()) << n;
-    std::uint64_t product = 1;
-    std::uint64_t previous = 1;
-    for (const FactorEntry& e : list) {
-        ASSERT_GT(e.prime, previous) << n;
-        ASSERT_TRUE(isPrime(e.prime)) << n;
-        ASSERT_GE(e.exponent, 1u);
-        for (unsigned i = 0; i < e.exponent; ++i) product *= e.prime;
-        previous = e.prime;
+    std::uint64_t product = 1, previous = 1;
+    for (const auto& [prime, exponent] : factors(n)) {
+        ASSERT_TRUE(prime > previous && isPrime(prime) && exponent >= 1) << n;
+        for (unsigned i = 0; i < exponent; ++i) product *= prime;
+        previous = prime;
     }
-    EXPECT_EQ(product, static_cast<std::uint64_t>(n)) << factorizationLine(n, list);
+    EXPECT_EQ(product, static_cast<std::uint64_t>(n));
 }
 
 std::vector<std::uint64_t> primesFrom(std::int64_t start, int count) {

@@ -16,7 +16,7 @@
 #include <stdexcept>
 #include <thread>
 
-#include "core/file_messages.hpp"
+#include "core/texts.hpp"
 #include "generation/generation_job.hpp"
 #include "generation/results_oracle.hpp"
 #include "generation/resume_job.hpp"

@@ -1,4 +1,4 @@
-// The megabyte figure and question shown before a large results file is opened.
+// The megabyte figure shown before a large results file is opened.
 #include "tools/results_size.hpp"
 
 #include <gtest/gtest.h>
@@ -20,7 +20,4 @@ TEST(ResultsSize, FigureIsCutToTwoDecimalsAndExactBeyondFourGigabytes) {
         EXPECT_EQ(megabyteText(figure), c.text) << c.bytes;
         EXPECT_EQ(isLargeFigure(figure), c.large) << c.bytes;
     }
-    EXPECT_EQ(largeFileQuestion(sizeFigure(12582911)),
-              "The file is bigger than 10 MB (11.99 MB). Do you still want to open it with "
-              "Notepad? If you cancel, you may choose the program to open it.");
 }

@@ -12,12 +12,11 @@ using namespace tarn;
 
 TEST(RecordsPerFileEntry, TakesWholeCountsFromTheFloorToTheTypeLimitAndRefusesTheRest) {
     // Accepted texts (no message) give their integer part.
-    const std::pair<std::string, std::vector<const char*>> cases[] = {
+    const std::pair<std::string_view, std::vector<const char*>> cases[] = {
         {"", {"1000", "1000.9", " 25000 ", "922337203685477"}},
-        {"Minimum value is 1000 records.", {"999", "999.9", "0", "-5", "0.5", "-1000"}},
-        {"Invalid entry.", {"", "   ", "abc", "1,000"}},
-        {"Value out of range. Value must be between 1000 and 922 337 203 685 477.",
-         {"922337203685478", "1e300", "1e400"}}};
+        {kMinimumRecordsMessage, {"999", "999.9", "0", "-5", "0.5", "-1000"}},
+        {kInvalidEntryMessage, {"", "   ", "abc", "1,000"}},
+        {kRecordsOutOfRangeMessage, {"922337203685478", "1e300", "1e400"}}};
     for (const auto& [message, texts] : cases)
         for (const char* text : texts) {
             const EntryResult r = parseRecordsPerFile(text);

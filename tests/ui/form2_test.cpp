@@ -2,21 +2,19 @@
 // the refusals, the worker and its final message, the stop by "Cancel" or by the title bar).
 #include "ui/form2.hpp"
 
-#include <gtest/gtest.h>
 #include <sys/stat.h>
 
 #include <QPointer>
 #include <QSignalSpy>
-#include <QTest>
 #include <csignal>
 #include <cstdio>
 #include <filesystem>
 #include <memory>
 
 #include "core/folder_lock.hpp"
-#include "support/temp_folder.hpp"
-#include "ui/fakes.hpp"
 #include "ui/folder_list.hpp"
+#include "ui/texts.hpp"
+#include "window_fixture.hpp"
 
 using namespace tarn;
 using tarn::ui::Form2;
@@ -29,21 +27,19 @@ std::string records(int count) {
     return text;
 }
 
-struct Form2Test : ::testing::Test {
-    test::TempFolder program, documents;
-    test::FakeMessageBox messages;
-    test::FakeShell shell;
-    bool jobRunning = false;
+// The split window as the main window opens it, over the main window's folder.
+struct Form2Test : test::WindowTest {
+    test::TempFolder documents;
     QPointer<Form2> form;
 
     void SetUp() override {
-        for (const char* name : {"Music", "Pictures", "Primes 2024", "Videos"})
+        for (const char* name : {"Music", "Pictures", "Videos"})
             std::filesystem::create_directory(documents.path() + name);
         // The documents folder as the shell gives it: no trailing separator.
         shell.documents = documents.path().substr(0, documents.path().size() - 1);
-        form = new Form2(messages, shell, program.path(), [this] { return jobRunning; });
+        window->spllit_Click();
+        form = qobject_cast<Form2*>(window->splitWindow());
     }
-    void TearDown() override { delete form.data(); }
 
     QWidget* child(const char* name) const { return form->findChild<QWidget*>(name); }
     std::string text(const char* name) const {
@@ -65,23 +61,16 @@ struct Form2Test : ::testing::Test {
 
 TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
     // A killed job left part of a last record.
-    test::writeFile(program.path() + "primes.txt", records(2500) + "2501;25");
-    jobRunning = true;  // a job writes the results file
-    split("1000");
-    EXPECT_EQ(messages.last().text, ui::kSplitWhileJobMessage);
-    jobRunning = false;
+    test::writeFile(dir.path() + "primes.txt", records(2500) + "2501;25");
     {
-        // Another window or tarn-cli has a job on the files.
-        const FolderLock other = FolderLock::tryTake(program.path());
+        // A job of the main window, another window or tarn-cli has the files.
+        const FolderLock other = FolderLock::tryTake(dir.path());
         split("1000");
-        EXPECT_EQ(messages.last().text, folderBusyMessage(program.path()));
-        EXPECT_EQ(text("Command2"), "Close");
+        EXPECT_EQ(messages.last().text, folderBusyMessage(dir.path()));
     }
     split("999.9");
-    ASSERT_EQ(messages.shown.size(), 3u);
-    EXPECT_EQ(messages.last().text, "Minimum value is 1000 records.");
-    EXPECT_EQ(messages.last().title, "Info");
-    EXPECT_EQ(text("Command2"), "Close");
+    ASSERT_EQ(messages.shown.size(), 2u);
+    EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, kMinimumRecordsMessage));
     EXPECT_EQ(files(shell.documents), 0);
 
     auto* dir1 = qobject_cast<ui::FolderList*>(child("Dir1"));
@@ -96,15 +85,12 @@ TEST_F(Form2Test, RefusesThenSplitsOnTheWorkerIntoTheFolderOpenedInTheList) {
 
     QSignalSpy finished(form.data(), &Form2::splitFinished);
     split("1000.9");
-    EXPECT_EQ(text("Command2"), "Cancel");
+    EXPECT_EQ(text("Command2"), ui::kSplitCancelCaption);
     ASSERT_TRUE(finished.wait(10000));
-    ASSERT_EQ(messages.shown.size(), 4u);
-    EXPECT_EQ(messages.last().text, "Done!!! 3 files were created. The last 7 bytes of " +
-                                        program.path() +
-                                        "primes.txt were left out: they end without CR LF, so "
-                                        "they are part of a record cut short.");
-    EXPECT_EQ(messages.last().title, "Info");
-    EXPECT_EQ(text("Command2"), "Close");
+    ASSERT_EQ(messages.shown.size(), 3u);
+    EXPECT_EQ(messages.last().text,
+              splitDoneMessage(3) + ' ' + cutRecordNote(dir.path() + "primes.txt", 7));
+    EXPECT_EQ(text("Command2"), ui::kSplitCloseCaption);
     EXPECT_EQ(files(pictures), 3);
     EXPECT_TRUE(form) << "a split that ends by itself leaves the window open";
 }
@@ -114,21 +100,24 @@ class Form2StopTest : public Form2Test, public ::testing::WithParamInterface<boo
 TEST_P(Form2StopTest, ClosingDuringASplitStopsIt) {
     // The results file is a pipe that the test feeds and keeps open, so the split surely runs
     // while the test presses its buttons, and can only end by seeing the stop.
-    const std::string results = program.path() + "primes.txt";
+    const std::string results = dir.path() + "primes.txt";
     ASSERT_EQ(mkfifo(results.c_str(), 0600), 0);
     const auto oldPipeAction = std::signal(SIGPIPE, SIG_IGN);
     split("1000");
     // Opening waits for the split to open the pipe; closing ends it even if the test fails.
     const std::unique_ptr<std::FILE, int (*)(std::FILE*)> pipe(std::fopen(results.c_str(), "w"),
                                                                std::fclose);
-    std::FILE* feed = pipe.get();
-    ASSERT_NE(feed, nullptr);
-    std::fputs(records(1500).c_str(), feed);
-    std::fflush(feed);
-    EXPECT_EQ(text("Command2"), "Cancel");
+    ASSERT_NE(pipe, nullptr);
+    const auto feed = [&](const std::string& text) {
+        std::fputs(text.c_str(), pipe.get());
+        std::fflush(pipe.get());
+    };
+    feed(records(1500));
     QTest::mouseClick(child("Command1"), Qt::LeftButton);
     ASSERT_EQ(messages.shown.size(), 1u);
     EXPECT_EQ(messages.last().text, ui::kSplitAlreadyRunningMessage);
+    // The split holds the folder, so that no job of any window or of tarn-cli starts on it.
+    EXPECT_TRUE(FolderLock::tryTake(dir.path()).busy());
 
     form->show();
     if (GetParam())
@@ -139,11 +128,8 @@ TEST_P(Form2StopTest, ClosingDuringASplitStopsIt) {
     ASSERT_TRUE(form) << "the window must wait for its worker";
     // More records wake the split if it waits for the pipe.
     QSignalSpy finished(form.data(), &Form2::splitFinished);
-    for (int more = 0; finished.count() == 0 && more < 1000; ++more) {
-        std::fputs(("2;" + std::to_string(more) + "\r\n").c_str(), feed);
-        std::fflush(feed);
-        finished.wait(5);
-    }
+    for (int more = 0; finished.count() == 0 && more < 1000; ++more)
+        feed("2;" + std::to_string(more) + "\r\n"), finished.wait(5);
     std::signal(SIGPIPE, oldPipeAction);
     ASSERT_EQ(finished.count(), 1);
     ASSERT_EQ(messages.shown.size(), 2u);

@@ -15,16 +15,13 @@ namespace tarn::test {
 
 class WindowTest : public ::testing::Test {
 protected:
-    void SetUp() override { window = std::make_unique<ui::Form1>(messages, shell, dir.path()); }
     // Stop any worker that a test left running, and let it finish before the window goes.
     void TearDown() override {
         if (!idle()) c().Command5->click();
         idle();
         window.reset();
     }
-
     Ui::Form1& c() { return window->controls(); }
-
     // Runs the event loop until no worker is left (or a generous deadline passes).
     bool idle() {
         return QTest::qWaitFor(
@@ -39,7 +36,7 @@ protected:
     TempFolder dir;
     FakeMessageBox messages;
     FakeShell shell;
-    std::unique_ptr<ui::Form1> window;
+    std::unique_ptr<ui::Form1> window = std::make_unique<ui::Form1>(messages, shell, dir.path());
 };
 
 }  // namespace tarn::test
