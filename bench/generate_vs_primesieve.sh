@@ -6,32 +6,11 @@
 # Usage: bench/generate_vs_primesieve.sh [build-dir] [limit]   (TARN_BENCH_BIG=1 also times 10^10)
 set -euo pipefail
 
-root="$(cd "$(dirname "$0")/.." && pwd)"
-build="${1:-$root/build/release}"
 limit="${2:-1000000000}"
-cli="$build/tarn-cli"
-[ -x "$cli" ] || { echo "no $cli: build first" >&2; exit 1; }
-
-sudo=()
-[ "$(id -u)" -ne 0 ] && sudo=(sudo)
-need=()
-command -v primesieve >/dev/null || need+=(primesieve)
-[ -x /usr/bin/time ] || need+=(time)
-if [ ${#need[@]} -gt 0 ]; then
-    "${sudo[@]}" apt-get install -y -qq --no-install-recommends "${need[@]}"
-fi
-
-work="$(mktemp -d "$root/build/bench-gen.XXXXXX")"
-trap 'rm -rf "$work"' EXIT
-
-# Runs one command; its wall seconds go to $wall and its peak memory in kB to $peak.
-timed() {
-    /usr/bin/time -f '%e %M' -o "$work/time" "$@" >/dev/null 2>&1
-    read -r wall peak < "$work/time"
-}
+# shellcheck source=bench/lib.sh
+source "$(dirname "$0")/lib.sh" "${1:-}" gen
 ours() { timed "$cli" --folder "$work" generate "$limit" "$@"; }
 theirs() { timed sh -c "primesieve $limit -p > '$work/primesieve.txt'"; }
-best() { printf '%s\n' "$@" | sort -g | head -1; }
 
 cores=$(nproc)
 threadCounts=(1 2 "$cores")

@@ -7,36 +7,13 @@
 # Usage: bench/height_vs_primesieve.sh [build-dir] [height...]
 set -euo pipefail
 
-root="$(cd "$(dirname "$0")/.." && pwd)"
-build="${1:-$root/build/release}"
-shift || true
 top=922337203685277
 span=1000000000
+# shellcheck source=bench/lib.sh
+source "$(dirname "$0")/lib.sh" "${1:-}" height
+shift || true
 heights=("$@")
 [ ${#heights[@]} -gt 0 ] || heights=(1000000000000 10000000000000 100000000000000 $((top - span)))
-cli="$build/tarn-cli"
-[ -x "$cli" ] || { echo "no $cli: build first" >&2; exit 1; }
-
-sudo=()
-[ "$(id -u)" -ne 0 ] && sudo=(sudo)
-need=()
-command -v primesieve >/dev/null || need+=(primesieve)
-[ -x /usr/bin/time ] || need+=(time)
-if [ ${#need[@]} -gt 0 ]; then
-    "${sudo[@]}" apt-get install -y -qq --no-install-recommends "${need[@]}"
-fi
-
-work="$(mktemp -d "$root/build/bench-height.XXXXXX")"
-trap 'rm -rf "$work"' EXIT
-
-# Runs one command; its wall seconds go to $wall, its peak memory in kB to $peak, and the share
-# of one core it used to $cpu.
-timed() {
-    /usr/bin/time -f '%e %M %P' -o "$work/time" "$@" >/dev/null 2>&1
-    read -r wall peak cpu < "$work/time"
-    cpu=${cpu%\%}
-}
-best() { printf '%s\n' "$@" | sort -g | head -1; }
 
 # A stopped job whose checkpoint stands at the last candidate of the turn before `height`.
 prepare() {

@@ -9,7 +9,6 @@
 namespace tarn {
 
 int TestPrime2(std::int64_t n, StopSignal& stop) {
-    stop.clear();
     if (n < 1) return kComposite;
     // The bound is taken on the double, as the Test command always has: Fix(sqrt n) + 1.
     const auto bound = static_cast<std::uint64_t>(std::sqrt(static_cast<double>(n))) + 1;

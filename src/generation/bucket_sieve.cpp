@@ -58,29 +58,35 @@ BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int6
                          std::int64_t chunkTurns, int groups)
     : firstTurn_(firstTurn),
       chunkTurns_(static_cast<std::uint64_t>(chunkTurns)),
-      reciprocal_((std::uint64_t{1} << 32) / chunkTurns_),
-      chunkCount_(static_cast<std::uint64_t>(std::max<std::int64_t>(endTurn - firstTurn, 0) +
-                                             chunkTurns - 1) /
-                  chunkTurns_),
-      shift_(std::has_single_bit(chunkTurns_) ? std::countr_zero(chunkTurns_) : -1) {
+      chunksPerSpan_(std::max<std::uint64_t>(kSpanTurns / chunkTurns_, 1)),
+      spanTurns_(chunksPerSpan_ * chunkTurns_),
+      reciprocal_((std::uint64_t{1} << 32) / spanTurns_),
+      shift_(std::has_single_bit(spanTurns_) ? std::countr_zero(spanTurns_) : -1) {
     const std::uint64_t root = limit > 0 ? wholeSqrt(static_cast<std::uint64_t>(limit)) : 0;
-    if (root < kMediumPrimeBound || chunkCount_ == 0) return;
-    // The turn within a chunk shares an entry's word with a 6-bit index.
-    if (chunkTurns_ > (std::uint64_t{1} << 26)) throw std::length_error("chunk too long");
+    if (root < kMediumPrimeBound || endTurn <= firstTurn) return;
+    // The turn within a span shares an entry's word with a 6-bit index.
+    if (spanTurns_ > (std::uint64_t{1} << 26)) throw std::length_error("chunk too long");
     std::vector<std::vector<std::uint32_t>> dealt =
         largePrimes(root, static_cast<std::size_t>(std::max(groups, 1)));
     if (dealt[0].empty()) return;
     groups_.resize(dealt.size());
     std::uint32_t largest = 0;
     std::size_t total = 0;
+    std::uint64_t spans = 0;
     for (std::size_t g = 0; g < dealt.size(); ++g) {
         total += dealt[g].size();
         if (!dealt[g].empty()) largest = std::max(largest, dealt[g].back());
-        groups_[g].pending = std::move(dealt[g]);
+        Group& group = groups_[g];
+        group.pending = std::move(dealt[g]);
+        group.lead = g % chunksPerSpan_;
+        group.origin = firstTurn - static_cast<std::int64_t>(group.lead * chunkTurns_);
+        group.spans =
+            (static_cast<std::uint64_t>(endTurn - group.origin) + spanTurns_ - 1) / spanTurns_;
+        spans = std::max(spans, group.spans);
     }
-    // A bucket for every chunk a next multiple can lie in, and the chunk being crossed off.
-    const std::uint64_t reach = (chunkTurns_ + longestStep(largest)) / chunkTurns_ + 1;
-    const std::size_t buckets = std::bit_ceil(std::min(reach, chunkCount_) + 1);
+    // A bucket for every span a next multiple can lie in, and the span being crossed off.
+    const std::uint64_t reach = (spanTurns_ + longestStep(largest)) / spanTurns_ + 1;
+    const std::size_t buckets = std::bit_ceil(std::min(reach, spans) + 1);
     bucketMask_ = buckets - 1;
     // Blocks large enough to fill in long runs, small enough that the partly filled ones stay
     // a small part of the whole.
@@ -155,17 +161,17 @@ void BucketSieve::spill(Group& group, Entry*& head) {
 }
 
 inline void BucketSieve::file(Group& group, std::uint32_t a, std::uint32_t index,
-                              std::uint64_t chunk, std::uint64_t turn) {
-    // The chunk of the turn by a multiplication, one short at most.
+                              std::uint64_t span, std::uint64_t turn) {
+    // The span of the turn by a multiplication, one short at most.
     std::uint64_t ahead = (turn * reciprocal_) >> 32;
-    turn -= ahead * chunkTurns_;
-    if (turn >= chunkTurns_) {
-        turn -= chunkTurns_;
+    turn -= ahead * spanTurns_;
+    if (turn >= spanTurns_) {
+        turn -= spanTurns_;
         ++ahead;
     }
-    chunk += ahead;
-    if (chunk >= chunkCount_) return;  // beyond the job: this prime is done
-    const std::size_t slot = (chunk & bucketMask_) + (once(a) ? bucketMask_ + 1 : 0);
+    span += ahead;
+    if (span >= group.spans) return;  // beyond the job: this prime is done
+    const std::size_t slot = (span & bucketMask_) + (once(a) ? bucketMask_ + 1 : 0);
     Entry*& head = group.heads[slot];
     *head++ = entry(a, turn, index);
     if ((reinterpret_cast<std::uintptr_t>(head) & (blockBytes_ - 1)) == 0) spill(group, head);
@@ -178,17 +184,17 @@ void BucketSieve::activate(Group& group, std::uint64_t horizon) {
         std::uint32_t wheel = 0;
         const std::uint64_t m = firstMultiple(p, start, wheel);
         const std::uint64_t turn =
-            (m - kSieveFirst) / kSievePeriod - static_cast<std::uint64_t>(firstTurn_);
-        const std::uint64_t chunk = turn / chunkTurns_;
+            (m - kSieveFirst) / kSievePeriod - static_cast<std::uint64_t>(group.origin);
+        const std::uint64_t span = turn / spanTurns_;
         // Primes whose squares lie past the start begin there, so the later ones further out.
-        if (std::uint64_t{p} * p >= start && chunk > horizon) break;
-        if (std::uint64_t{p} * p >= start && chunk >= chunkCount_) {
+        if (std::uint64_t{p} * p >= start && span > horizon) break;
+        if (std::uint64_t{p} * p >= start && span >= group.spans) {
             group.nextPending = group.pending.size();
             break;
         }
         ++group.nextPending;
-        file(group, static_cast<std::uint32_t>(p / kSievePeriod), walkIndex(p, wheel), chunk,
-             turn - chunk * chunkTurns_);
+        file(group, static_cast<std::uint32_t>(p / kSievePeriod), walkIndex(p, wheel), span,
+             turn - span * spanTurns_);
     }
     if (group.nextPending == group.pending.size()) {
         group.pending = {};
@@ -198,32 +204,40 @@ void BucketSieve::activate(Group& group, std::uint64_t horizon) {
 
 void BucketSieve::crossOffNext(int index, std::uint8_t* bytes, std::int64_t turns) {
     Group& group = groups_[static_cast<std::size_t>(index)];
-    const std::uint64_t chunk = group.chunk++;
-    if (!group.pending.empty()) activate(group, chunk + bucketMask_);
-    const auto length = static_cast<std::uint64_t>(turns);
-    if (shift_ >= 0) {
-        crossOff<false, true>(group, chunk, bytes, length);
-        crossOff<true, true>(group, chunk, bytes, length);
-    } else {
-        crossOff<false, false>(group, chunk, bytes, length);
-        crossOff<true, false>(group, chunk, bytes, length);
+    const std::uint64_t chunk = group.chunk++ + group.lead;
+    const std::uint64_t span = chunk / chunksPerSpan_;
+    const std::uint64_t at = chunk % chunksPerSpan_;
+    if (chunk == group.lead || at == 0) {
+        // The span's multiples all lie within its sieve, though a last span may end early.
+        group.sieve.assign(spanTurns_, 0);
+        if (!group.pending.empty()) activate(group, span + bucketMask_);
+        std::uint8_t* const sieve = group.sieve.data();
+        if (shift_ >= 0) {
+            crossOff<false, true>(group, span, sieve, spanTurns_);
+            crossOff<true, true>(group, span, sieve, spanTurns_);
+        } else {
+            crossOff<false, false>(group, span, sieve, spanTurns_);
+            crossOff<true, false>(group, span, sieve, spanTurns_);
+        }
     }
+    const std::uint8_t* const from = group.sieve.data() + at * chunkTurns_;
+    for (std::size_t i = 0; i < static_cast<std::size_t>(turns); ++i) bytes[i] |= from[i];
 }
 
 template <bool kOnce, bool kShift>
-void BucketSieve::crossOff(Group& group, std::uint64_t chunk, std::uint8_t* bytes,
+void BucketSieve::crossOff(Group& group, std::uint64_t span, std::uint8_t* bytes,
                            std::uint64_t length) {
     const std::size_t base = kOnce ? bucketMask_ + 1 : 0;
-    Entry*& bucket = group.heads[base + (chunk & bucketMask_)];
-    // The bucket starts afresh: what lands in it now belongs to a chunk after the job's end.
+    Entry*& bucket = group.heads[base + (span & bucketMask_)];
+    // The bucket starts afresh: what lands in it now belongs to a span after the job's end.
     const Entry* end = std::exchange(bucket, nullptr);
     spill(group, bucket);
     auto* block =
         reinterpret_cast<Block*>(reinterpret_cast<std::uintptr_t>(end) & ~(blockBytes_ - 1));
     // Held in locals: the byte stores below could alias any member.
-    const std::uint64_t chunkTurns = chunkTurns_, reciprocal = reciprocal_, mask = bucketMask_;
+    const std::uint64_t spanTurns = spanTurns_, reciprocal = reciprocal_, mask = bucketMask_;
     const auto shift = static_cast<unsigned>(shift_);
-    const std::uint64_t chunksLeft = chunkCount_ - chunk;
+    const std::uint64_t spansLeft = group.spans - span;
     const std::uintptr_t blockBytes = blockBytes_;
     Entry** const heads = group.heads.data() + base;
     for (;;) {
@@ -231,32 +245,33 @@ void BucketSieve::crossOff(Group& group, std::uint64_t chunk, std::uint8_t* byte
             const Entry e = *at;
             const std::uint64_t a = e & 0xffffffff;
             std::uint64_t turn = e >> 38;
-            std::uint32_t step = (e >> 32) & 63;
-            // Filed here, the next multiple lies in this chunk; primes whose shortest step
-            // spans a chunk have no other.
+            const std::uint32_t residue = (e >> 32) & 56;
+            std::uint32_t wheel = (e >> 32) & 7;
+            // Filed here, the next multiple lies in this span; primes whose shortest step
+            // is a span or longer have no other. The next position comes by arithmetic, not from
+            // the table, so that the walk waits on no load from one multiple to the next.
             do {
-                const WalkStep& walk = kWalk[step];
-                const std::uint8_t bit = walk.bit;
-                step = walk.next;
-                const std::uint64_t next = turn + a * walk.step + walk.carry;
-                bytes[turn] |= bit;
-                turn = next;
+                const WalkStep& walk = kWalk[residue | wheel];
+                bytes[turn] |= walk.bit;
+                turn += a * walk.step + walk.carry;
+                wheel = (wheel + 1) & 7;
             } while (!kOnce && turn < length);
+            const std::uint32_t step = residue | wheel;
             std::uint64_t ahead;
             if constexpr (kShift) {
                 ahead = turn >> shift;
-                turn &= chunkTurns - 1;
+                turn &= spanTurns - 1;
             } else {
-                // The chunk of the next multiple by a multiplication, one short at most.
+                // The span of the next multiple by a multiplication, one short at most.
                 ahead = (turn * reciprocal) >> 32;
-                turn -= ahead * chunkTurns;
-                if (turn >= chunkTurns) {
-                    turn -= chunkTurns;
+                turn -= ahead * spanTurns;
+                if (turn >= spanTurns) {
+                    turn -= spanTurns;
                     ++ahead;
                 }
             }
-            if (ahead >= chunksLeft) continue;  // beyond the job: this prime is done
-            Entry*& head = heads[(chunk + ahead) & mask];
+            if (ahead >= spansLeft) continue;  // beyond the job: this prime is done
+            Entry*& head = heads[(span + ahead) & mask];
             *head++ = entry(a, turn, step);
             if ((reinterpret_cast<std::uintptr_t>(head) & (blockBytes - 1)) == 0) [[unlikely]]
                 spill(group, head);

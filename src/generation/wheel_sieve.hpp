@@ -2,10 +2,11 @@
 // byte is one wheel turn: turn t starts at 30t + 11 and bit b stands for 30t + 11 +
 // kTurnOffsets[b], the eight numbers of the turn that have no factor 2, 3 or 5. A segment of
 // turns is small enough to stay in the first-level cache. The multiples of 7 to 19 come from a
-// pattern that repeats every 7 * 11 * 13 * 17 * 19 turns. The other primes hit every segment:
-// those below 2^13 cross off along eight fixed-bit progressions of step p bytes (a tight loop per
-// progression), the rest walk their multiples along the wheel in one loop, which ends once per
-// segment rather than eight times. The few thousand of them make a state of a few hundred
+// pattern that repeats every 7 * 11 * 13 * 17 * 19 turns, those of 23 to 61 from a pattern for
+// each pair of them. The other primes hit every segment:
+// those below 2^13 cross off along eight fixed-bit progressions of step p bytes (taken together,
+// eight stores a round), the rest walk their multiples along the wheel in one loop, which ends once
+// per segment rather than eight times. The few thousand of them make a state of a few hundred
 // kilobytes, one per sieving thread. The larger primes wait in the buckets of bucket_sieve.hpp.
 #pragma once
 
@@ -20,6 +21,9 @@ inline constexpr std::uint32_t kMediumPrimeBound = 1u << 15;
 
 class WheelSieve {
 public:
+    // Patterns of two primes each, after the one of 7 to 19.
+    static constexpr std::size_t kPairPatterns = 5;
+
     // Sieves turns from `firstTurn` on, with the primes below kMediumPrimeBound that sieve up
     // to `limit`.
     WheelSieve(std::int64_t firstTurn, std::int64_t limit);
@@ -44,8 +48,12 @@ private:
         std::uint64_t next;   // turn of the next multiple, from the current segment
     };
 
-    std::int64_t turn_;      // first turn of the next segment
-    std::size_t patternAt_;  // where turn_ falls in the pattern
+    // Where turn_ falls in each pattern.
+    void placePatterns();
+
+    std::int64_t turn_;  // first turn of the next segment
+    std::size_t patternAt_ = 0;
+    std::array<std::size_t, kPairPatterns> pairAt_{};
     std::vector<Medium> medium_;
     std::vector<Walker> walkers_;
 };

@@ -1,7 +1,5 @@
 // Test, Factorize and "Cancel all calculations". The test and the factorization run on a
 // worker; one of them at a time, so that two results never race into the status line.
-#include <QSemaphore>
-#include <memory>
 
 #include "core/entry.hpp"
 #include "core/factorization.hpp"
@@ -41,17 +39,10 @@ void Form1::Command2_Click() {
         return;
     }
     numberRunning_ = true;
-    // TestPrime2 clears the stop request as it starts: the command returns once the worker has
-    // taken the test up, so that a "Cancel all calculations" right after the press finds it.
-    auto started = std::make_shared<QSemaphore>();
+    numberStop_.clear();
     runOnWorker(
-        this,
-        [this, number, started] {
-            started->release();
-            return TestPrime2(number, numberStop_);
-        },
+        this, [this, number] { return TestPrime2(number, numberStop_); },
         [this, number](int code) { finishTest(number, code); });
-    started->acquire();
 }
 
 void Form1::finishTest(std::int64_t number, int code) {

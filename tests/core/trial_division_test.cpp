@@ -76,11 +76,13 @@ TEST(TestPrime2, EdgeCasesOfTheWheelAndItsBoundAndStrongPseudoprimes) {
     }
 }
 
-TEST(TestPrime2, ClearsAStopMadeBeforeTheCallAndStopsOnOneMadeDuringTheWheel) {
+TEST(TestPrime2, StopsAtAWheelTurnOnceAsked) {
     StopSignal stop;
     stop.request();
-    EXPECT_EQ(TestPrime2(1000003, stop), kPrime);
-    EXPECT_FALSE(stop.requested());
+    EXPECT_EQ(TestPrime2(97, stop), kPrime);  // decided without a turn
+    EXPECT_EQ(TestPrime2(1000003, stop), kStopped);
+    EXPECT_TRUE(stop.requested());
+    stop.clear();
     // A prime near the upper bound keeps the wheel busy for a million turns while another
     // thread keeps asking; should a call end before the asker runs, the next one is asked.
     std::atomic<bool> done = false;
