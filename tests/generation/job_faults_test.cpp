@@ -6,11 +6,9 @@
 // remove) and a file of whole records in order that the checkpoint describes, and a resume on a
 // working disk must then finish the file of one uninterrupted job, byte for byte. A fresh job
 // starts over the finished file of an earlier one.
-#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <atomic>
-#include <cerrno>
 #include <filesystem>
 #include <stdexcept>
 #include <thread>
@@ -32,24 +30,14 @@ using namespace std::chrono_literals;
 
 constexpr std::int64_t kLimit = 100'000;  // about 70 KB of records, 52 chunks of 64 turns
 
-// What fails, counted from the run's start: Write, ThrowInWriter at byte `at`; Sync, Checkpoint,
-// ThrowInCheckpoint at the at-th call; Delete, Replace, Truncate (inside its last durable record)
-// the results file after the at-th checkpoint during the job; Kill as the file is opened.
-enum class Kind {
-    Write,
-    Sync,
-    Checkpoint,
-    ThrowInWriter,
-    ThrowInCheckpoint,
-    Kill,
-    Delete,
-    Replace,
-    Truncate
-};
+// What fails, counted from the run's start: Write, WriterThrows at byte `at`; Sync, Save,
+// SaveThrows at the at-th call; Delete, Replace, Cut (inside its last durable record) the results
+// file after the at-th checkpoint during the job; Kill as the file is opened.
+enum Kind { Write, Sync, Save, WriterThrows, SaveThrows, Kill, Delete, Replace, Cut };
 struct Fault {
     Kind kind;
     std::uint64_t at;
-    bool persistent = false;  // Sync, Checkpoint: every later call fails too
+    bool persistent = false;  // Sync, Save: every later call fails too
 };
 
 // Windows refuses to delete or rename over the results file while a job appends to it: the job
@@ -69,7 +57,7 @@ public:
                                              int& error) override {
         auto file = JobFiles::openResults(path, append, error);
         path_ = path;
-        if (hits(Kind::Kill, 0)) {
+        if (hits(Kill, 0)) {
             killedResults = readFile(path);
             killedCheckpoint = readFile(path.substr(0, path.size() - 3) + "ini");
         }
@@ -77,10 +65,10 @@ public:
     }
     std::string saveCheckpoint(const std::string& path, const Checkpoint& c) override {
         const std::uint64_t count = ++checkpoints_;
-        if (hits(Kind::ThrowInCheckpoint, count)) throw std::runtime_error("injected");
-        if (hits(Kind::Checkpoint, count)) return systemReason(EIO);
+        if (hits(SaveThrows, count)) throw std::runtime_error("injected");
+        if (hits(Save, count)) return systemReason(EIO);
         std::string reason = JobFiles::saveCheckpoint(path, c);
-        if (c.interrupted == 1 && fault_.kind >= Kind::Delete && hits(fault_.kind, ++changes_))
+        if (c.interrupted == 1 && fault_.kind >= Delete && hits(fault_.kind, ++changes_))
             change(oracleResults(c.candidate, enumerated_).size());
         return reason;
     }
@@ -101,17 +89,16 @@ private:
                 std::this_thread::sleep_for(100us);
             const Fault& fault = f.fault_;
             std::size_t part = size;
-            if ((fault.kind == Kind::Write || fault.kind == Kind::ThrowInWriter) &&
-                bytes + size > fault.at) {
+            if ((fault.kind == Write || fault.kind == WriterThrows) && bytes + size > fault.at) {
                 f.fired = true;
-                if (fault.kind == Kind::ThrowInWriter) throw std::runtime_error("injected");
+                if (fault.kind == WriterThrows) throw std::runtime_error("injected");
                 part = static_cast<std::size_t>(fault.at - std::min(fault.at, bytes));
             }
             const int error = file_->write(data, part, written);
             bytes += written;
             return error != 0 || part == size ? error : ENOSPC;
         }
-        int sync() override { return f.hits(Kind::Sync, ++f.syncs_) ? EIO : file_->sync(); }
+        int sync() override { return f.hits(Sync, ++f.syncs_) ? EIO : file_->sync(); }
         FaultyFiles& f;
         std::uint64_t bytes = 0, writes = 0;
     };
@@ -124,12 +111,12 @@ private:
     }
     // The user deletes, replaces or cuts the file with `durable` bytes on the disk.
     void change(std::uint64_t durable) {
-        if (fault_.kind == Kind::Truncate) return std::filesystem::resize_file(path_, durable - 3);
+        if (fault_.kind == Cut) return std::filesystem::resize_file(path_, durable - 3);
         const std::string records = readFile(path_).substr(0, durable);
         std::error_code refused;
         std::filesystem::remove(path_, refused);
         EXPECT_EQ(!!refused, kResultsInUseAreKept) << refused.message();
-        if (fault_.kind == Kind::Replace && !refused) writeFile(path_, records);
+        if (fault_.kind == Replace && !refused) writeFile(path_, records);
     }
 
     const Fault fault_;
@@ -140,114 +127,89 @@ private:
 
 std::string expectedMessage(Kind kind, const std::string& folder) {
     const std::string results = folder + "primes.txt";
-    if (kResultsInUseAreKept && (kind == Kind::Delete || kind == Kind::Replace)) return "";
-    switch (kind) {
-        case Kind::Write:
-            return fileWriteFailure(results, systemReason(ENOSPC));
-        case Kind::Sync:
-            return fileWriteFailure(results, systemReason(EIO));
-        case Kind::Checkpoint:
-            return fileWriteFailure(folder + "primes.ini", systemReason(EIO));
-        case Kind::Kill:
-            return "";
-        case Kind::Delete:
-            return resultsChangeMessage(results, {FileCheck::Change::Gone}, 0);
-        case Kind::Replace:
-            return resultsChangeMessage(results, {FileCheck::Change::Replaced}, 0);
-        case Kind::Truncate:  // then the sizes, and what was kept
-            return "The file " + results + " holds ";
-        default:
-            return unexpectedFailure("injected");
-    }
+    if (kResultsInUseAreKept && (kind == Delete || kind == Replace)) return "";
+    const std::string messages[] = {fileWriteFailure(results, systemReason(ENOSPC)),
+                                    fileWriteFailure(results, systemReason(EIO)),
+                                    fileWriteFailure(folder + "primes.ini", systemReason(EIO)),
+                                    unexpectedFailure("injected"),
+                                    unexpectedFailure("injected"),
+                                    "",
+                                    resultsChangeMessage(results, {FileCheck::Change::Gone}, 0),
+                                    resultsChangeMessage(results, {FileCheck::Change::Replaced}, 0),
+                                    "The file " + results + " holds "};  // then the sizes
+    return messages[kind];
 }
 
 // A fresh job, or (resumed) a resume of a job stopped at 30 * 300 + 7, meets the fault; then the
 // file is finished on a working disk.
 void runWithFault(const Fault& fault, bool enumerated, bool resumed, std::string& missed) {
-    // One sieving thread for plain records, three for enumerated ones.
-    JobOptions options{enumerated ? 3 : 1, 0ms, 16, 64};
-    const std::string name = std::to_string(static_cast<int>(fault.kind)) + " at " +
-                             std::to_string(fault.at) + (fault.persistent ? " on" : "") +
-                             (enumerated ? " enumerated" : " plain") + (resumed ? " resumed" : "");
+    const std::string name = std::to_string(fault.kind) + " at " + std::to_string(fault.at) +
+                             (fault.persistent ? " on" : "") + (enumerated ? " enumerated" : "") +
+                             (resumed ? " resumed" : "");
     SCOPED_TRACE(name);
     TempFolder folder;
+    const std::string txt = folder.path() + "primes.txt", ini = folder.path() + "primes.ini";
     const std::string full = oracleResults(kLimit, enumerated);
     const std::int64_t kept = resumed ? 30 * 300 + 7 : 0;  // on the disk before the run
     if (resumed) {
-        writeFile(folder.path() + "primes.txt", oracleResults(kept, enumerated));
-        writeFile(folder.path() + "primes.ini", oracleCheckpoint(kept, kLimit, 1));
+        writeFile(txt, oracleResults(kept, enumerated));
+        writeFile(ini, oracleCheckpoint(kept, kLimit, 1));
     } else {
         runJob({folder.path(), 1000, enumerated}, StopSignal{});
     }
-
     FaultyFiles files(fault, enumerated);
-    options.files = &files;
-    std::string message;
-    if (resumed) {
-        const ResumeResult r = runResume(folder.path(), StopSignal{}, nullptr, {}, options);
-        message = r.status == ResumeResult::Status::Failed ? r.message : "";
-    } else {
-        const JobResult r =
-            runJob({folder.path(), kLimit, enumerated}, StopSignal{}, nullptr, options);
-        message = r.status == JobResult::Status::Failed ? r.error : "";
-    }
+    // One sieving thread for plain records, three for enumerated ones.
+    const JobOptions options{enumerated ? 3 : 1, 0ms, 16, 64, &files};
+    const std::string message =
+        resumed ? runResume(folder.path(), StopSignal{}, nullptr, {}, options).message
+                : runJob({folder.path(), kLimit, enumerated}, StopSignal{}, nullptr, options).error;
     if (!files.fired) missed += name + "; ";
-    if (fault.kind == Kind::Kill) {
-        writeFile(folder.path() + "primes.txt", files.killedResults);
-        writeFile(folder.path() + "primes.ini", files.killedCheckpoint);
+    if (fault.kind == Kill) {
+        writeFile(txt, files.killedResults);
+        writeFile(ini, files.killedCheckpoint);
     }
     const auto point = [&] {
-        const auto c = readCheckpoint(folder.path() + "primes.ini").checkpoint;
+        const auto c = readCheckpoint(ini).checkpoint;
         return c && c->interrupted == 1 ? c->candidate : 0;
     };
     if (files.fired) {
         const std::string expected = expectedMessage(fault.kind, folder.path());
-        EXPECT_EQ(fault.kind == Kind::Truncate ? message.substr(0, expected.size()) : message,
-                  expected);
+        EXPECT_EQ(fault.kind == Cut ? message.substr(0, expected.size()) : message, expected);
         // Whole records in order, and nothing that was on the disk before the run is gone.
-        const std::string file = readFile(folder.path() + "primes.txt");
+        const std::string file = readFile(txt);
         EXPECT_TRUE(full.starts_with(file)) << file.size() << " bytes";
         EXPECT_TRUE(file.ends_with("\r\n") || file.empty());
-        EXPECT_GE(point(), fault.kind < Kind::Delete ? kept : 0);
+        EXPECT_GE(point(), fault.kind < Delete ? kept : 0);
         // A finished checkpoint names a whole file.
-        if (const auto c = readCheckpoint(folder.path() + "primes.ini").checkpoint;
-            c && c->interrupted == 0 && c->candidate > c->limit) {
+        const auto c = readCheckpoint(ini).checkpoint;
+        if (c && c->interrupted == 0 && c->candidate > c->limit) {
             EXPECT_TRUE(sameText(file, oracleResults(c->limit, enumerated)));
         }
-        EXPECT_TRUE(file.starts_with(oracleResults(point(), enumerated)))
-            << "checkpoint " << point();
+        EXPECT_TRUE(file.starts_with(oracleResults(point(), enumerated))) << point();
     }
-
     // A working disk: resume what can be resumed, generate again what cannot.
-    for (int attempt = 0;
-         attempt < 2 && readFile(folder.path() + "primes.ini") != completeCheckpoint(kLimit);
-         ++attempt) {
+    for (int attempt = 0; attempt < 2 && readFile(ini) != completeCheckpoint(kLimit); ++attempt) {
+        if (point() == 0) runJob({folder.path(), kLimit, enumerated}, StopSignal{});
         if (point() > 0) {
             EXPECT_EQ(runResume(folder.path(), StopSignal{}, nullptr, {}).status,
                       ResumeResult::Status::Completed);
-        } else {
-            runJob({folder.path(), kLimit, enumerated}, StopSignal{});
         }
     }
-    EXPECT_TRUE(sameText(readFile(folder.path() + "primes.txt"), full));
-    EXPECT_EQ(readFile(folder.path() + "primes.ini"), completeCheckpoint(kLimit));
+    EXPECT_TRUE(sameText(readFile(txt), full));
+    EXPECT_EQ(readFile(ini), completeCheckpoint(kLimit));
 }
 
+// One row per way of failing: a write that fails at once, inside the seeds, at the end of a
+// write or inside one, deep into the run; the first flush or checkpoint or a later one, once or
+// for good.
 void runFaultTable(bool resumed) {
-    std::vector<Fault> faults;
-    // Inside the seed records, on the edges of a buffer, deep into the run.
-    for (const std::uint64_t at : {0, 1, 5, 12, 13, 4095, 4096, 4097, 20000, 33333, 50001})
-        faults.push_back({Kind::Write, at});
-    for (const std::uint64_t at : {1, 2, 3})
-        for (const bool persistent : {false, true})
-            for (const Kind kind : {Kind::Sync, Kind::Checkpoint})
-                faults.push_back({kind, at, persistent});
-    for (const std::uint64_t at : {0, 9000, 30000}) faults.push_back({Kind::ThrowInWriter, at});
+    std::vector<Fault> faults{
+        {WriterThrows, 0}, {WriterThrows, 30000}, {SaveThrows, 1}, {SaveThrows, 3},
+        {Delete, 1},       {Replace, 1},          {Cut, 1},        {Kill, 0}};
+    for (const std::uint64_t at : {0, 5, 12, 13, 33333}) faults.push_back({Write, at});
     for (const std::uint64_t at : {1, 3})
-        for (const Kind kind :
-             {Kind::ThrowInCheckpoint, Kind::Delete, Kind::Replace, Kind::Truncate})
-            faults.push_back({kind, at});
-    faults.push_back({Kind::Kill, 0});
+        for (const bool persistent : {false, true})
+            for (const Kind kind : {Sync, Save}) faults.push_back({kind, at, persistent});
     std::string missed;
     for (const Fault& fault : faults)
         for (const bool enumerated : {false, true})
