@@ -4,14 +4,12 @@
 // their own). A failed job must name the file and the reason.
 #include "generation/generation_job.hpp"
 
-#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <atomic>
 #include <cerrno>
 #include <filesystem>
 #include <random>
-#include <stdexcept>
 #include <thread>
 
 #include "core/texts.hpp"
@@ -25,7 +23,6 @@ namespace {
 using namespace test;
 using Status = JobResult::Status;
 using namespace std::chrono_literals;
-using testing::StartsWith;
 
 struct JobRun {
     JobResult result;
@@ -35,8 +32,8 @@ struct JobRun {
 JobRun runIn(const TempFolder& folder, JobSpec spec, const JobOptions& options = {},
              const StopSignal& stop = StopSignal{}) {
     spec.folder = folder.path();
-    JobResult result = runJob(spec, stop, nullptr, options);
-    return {result, readFile(folder.path() + "primes.txt"), readFile(folder.path() + "primes.ini")};
+    return {runJob(spec, stop, nullptr, options), readFile(folder.path() + "primes.txt"),
+            readFile(folder.path() + "primes.ini")};
 }
 
 void expectComplete(const JobRun& r, std::int64_t limit, bool enumerated) {
@@ -54,10 +51,9 @@ void expectComplete(std::int64_t limit, bool enumerated, JobOptions options) {
 }
 
 TEST(GenerationJob, CompleteRunsMatchTheOracle) {
-    // Limits at and around the ends of wheel turns (30k + 7, 30k + 11).
+    // The minimum, a prime, the end of a wheel turn (30k + 7), past it, the next turn's start.
     int threads = 0;
-    for (const std::int64_t limit :
-         {100, 110, 997, 1000, 1206, 1207, 1208, 1210, 1211, 1212, 30 * 331 + 7, 30 * 331 + 11})
+    for (const std::int64_t limit : {100, 997, 1207, 1208, 1211})
         for (const bool enumerated : {false, true})
             expectComplete(limit, enumerated, {threads++ % 3 + 1});
     // The first batch is one turn, the next ones 32768 turns, a chunk 4 batches: edges of the
@@ -69,8 +65,7 @@ TEST(GenerationJob, CompleteRunsMatchTheOracle) {
     }
     // Many small chunks for more threads than cores, each waiting for the serial numbers of the
     // one before.
-    for (const int many : {2, 3, 8})
-        expectComplete(300'007, true, {many, kCheckpointInterval, 7, 50});
+    for (const int many : {3, 8}) expectComplete(300'007, true, {many, kCheckpointInterval, 7, 50});
     std::mt19937_64 random(20240601);
     std::uniform_int_distribution<std::int64_t> pick(100, 3'000'000);
     for (int i = 0; i < 3; ++i) expectComplete(pick(random), i % 2 == 1, {i % 3 + 1});
@@ -164,9 +159,9 @@ private:
 // uninterrupted run. A stop seen after the last turn is a completion.
 TEST(GenerationJob, StoppedAndContinuedJobsGiveTheFileOfOneRun) {
     const std::tuple<std::int64_t, std::uint64_t, int> cases[] = {
-        {100'000, 0, 1},    {100'000, 1, 1},     {100'000, 30, 1}, {123'457, 3000, 2},
-        {200'000, 9000, 3}, {200'000, 20000, 8}, {100, 1, 1},      {100, 30, 3}};
-    int stops = 0;
+        {100'000, 0, 1},    {100'000, 1, 1},     {100'000, 30, 1},
+        {123'457, 3000, 2}, {200'000, 20000, 8}, {100, 30, 3}};
+    int stops = 0, checkpoints = 0;
     for (const auto& [limit, stopAt, threads] : cases) {
         for (const bool enumerated : {false, true}) {
             SCOPED_TRACE(std::to_string(stopAt) + " bytes, limit " + std::to_string(limit) + ", " +
@@ -177,10 +172,12 @@ TEST(GenerationJob, StoppedAndContinuedJobsGiveTheFileOfOneRun) {
                 const bool last = spec.append && bytes == 0;
                 StopSignal stop;
                 if (bytes == 0 && !last) stop.request();
+                // The last run checkpoints all the time, its writer waiting for a few of them.
                 WatchedFiles files(stop, last ? UINT64_MAX : std::max<std::uint64_t>(bytes, 1),
-                                   enumerated);
-                const JobRun r =
-                    runIn(folder, spec, {threads, kCheckpointInterval, 5, 40, &files}, stop);
+                                   enumerated, last ? 3 : 0);
+                const JobRun r = runIn(
+                    folder, spec, {threads, last ? 0ms : kCheckpointInterval, 5, 40, &files}, stop);
+                checkpoints += files.checkpoints;
                 if (last || r.result.status == Status::Completed) {
                     expectComplete(r, limit, enumerated);
                     break;
@@ -198,40 +195,25 @@ TEST(GenerationJob, StoppedAndContinuedJobsGiveTheFileOfOneRun) {
             }
         }
     }
-    EXPECT_GE(stops, 20);  // most stops land inside a job
+    EXPECT_GE(stops, 15);  // most stops land inside a job
+    EXPECT_GE(checkpoints, 20);
 }
 
-TEST(GenerationJob, CheckpointsDuringTheJobAgreeWithTheFile) {
-    TempFolder folder;
-    StopSignal never;
-    WatchedFiles files(never, UINT64_MAX, true, 3);
-    // Small batches and small buffers also hand many partial buffers to the writer.
-    expectComplete(runIn(folder, {"", 2'000'000, true}, {3, 0ms, 64, 64, &files}), 2'000'000, true);
-    EXPECT_GE(files.checkpoints, 3);
-}
-
-JobResult failIn(const std::string& folder, std::int64_t limit) {
-    const JobResult r = runJob(JobSpec{folder, limit}, StopSignal{});
-    EXPECT_EQ(r.status, JobResult::Status::Failed);
-    return r;
-}
-
-// Failures of the real file system: a full device, and a folder that is not there (the
-// checkpoint goes first, before the results file is emptied).
+// Failures of the real file system: a folder that is not there (the checkpoint goes first,
+// before the results file is emptied), and a full device.
 TEST(GenerationJobFailure, FailuresNameTheFile) {
-    if (std::filesystem::exists("/dev/full")) {
-        TempFolder folder;
-        std::filesystem::create_symlink("/dev/full", folder.path() + "primes.txt");
-        EXPECT_THAT(
-            failIn(folder.path(), 100'000).error,
-            StartsWith(fileWriteFailure(folder.path() + "primes.txt", systemReason(ENOSPC))));
-        EXPECT_EQ(readCheckpoint(folder.path() + "primes.ini").checkpoint->interrupted, 0);
-    }
     TempFolder folder;
     const std::string missing = folder.path() + "gone/";
-    EXPECT_EQ(failIn(missing, 1000).error,
-              fileWriteFailure(missing + "primes.ini", systemReason(ENOENT)));
+    JobResult r = runJob({missing, 1000}, StopSignal{});
+    EXPECT_EQ(r.error, fileWriteFailure(missing + "primes.ini", systemReason(ENOENT)));
     EXPECT_FALSE(std::filesystem::exists(missing));
+    if (!std::filesystem::exists("/dev/full")) return;
+    std::filesystem::create_symlink("/dev/full", folder.path() + "primes.txt");
+    r = runJob({folder.path(), 100'000}, StopSignal{});
+    EXPECT_TRUE(
+        r.error.starts_with(fileWriteFailure(folder.path() + "primes.txt", systemReason(ENOSPC))))
+        << r.error;
+    EXPECT_EQ(readCheckpoint(folder.path() + "primes.ini").checkpoint->interrupted, 0);
 }
 
 }  // namespace

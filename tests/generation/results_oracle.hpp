@@ -8,29 +8,20 @@
 #include <algorithm>
 #include <cstdint>
 #include <string>
-#include <vector>
 
 #include "support/plain_sieve.hpp"
 
 namespace tarn::test {
 
-inline std::vector<std::int64_t> sievePrimes(std::int64_t upTo) {
-    const std::vector<bool> prime = plainSieve(static_cast<std::size_t>(upTo));
-    std::vector<std::int64_t> primes;
-    for (std::int64_t n = 2; n <= upTo; ++n)
-        if (prime[static_cast<std::size_t>(n)]) primes.push_back(n);
-    return primes;
-}
-
 inline std::int64_t primeCount(std::int64_t upTo) {
-    return static_cast<std::int64_t>(sievePrimes(upTo).size());
+    return static_cast<std::int64_t>(plainSegment(0, upTo).size());
 }
 
 // The records of a job that has written every prime up to `upTo` (its limit, or its stop).
 inline std::string oracleResults(std::int64_t upTo, bool enumerated) {
     std::string text;
     std::int64_t serial = 0;
-    for (const std::int64_t p : sievePrimes(upTo)) {
+    for (const std::int64_t p : plainSegment(0, upTo)) {
         if (enumerated) text += std::to_string(++serial) + ";";
         text += std::to_string(p) + "\r\n";
     }
@@ -41,7 +32,7 @@ inline std::string oracleResults(std::int64_t upTo, bool enumerated) {
 inline std::string oracleCheckpoint(std::int64_t candidate, std::int64_t limit, int interrupted) {
     std::string line;
     for (const std::int64_t field : {candidate, limit, std::int64_t{interrupted}})
-        line.append(" ").append(std::to_string(field)).append(" ");
+        line += " " + std::to_string(field) + " ";
     return line + "\r\n";
 }
 
