@@ -31,18 +31,16 @@ std::string contents(const std::string& path) {
 // Writes the two files and runs the resume, counting its two announcements.
 struct Resume {
     TempFolder folder;
+    const std::string results = folder.path() + "primes.txt", ini = folder.path() + "primes.ini";
     int gathering = 0, continuing = 0;
     ResumeResult result;
-    std::string resultsPath() const { return folder.path() + "primes.txt"; }
-    std::string checkpointPath() const { return folder.path() + "primes.ini"; }
 
     Resume(const std::string& records, const std::string& checkpoint, const StopSignal& stop) {
-        if (records != kNone) writeFile(resultsPath(), records);
-        if (checkpoint == kFolder) std::filesystem::create_directory(checkpointPath());
-        if (checkpoint != kNone && checkpoint != kFolder) writeFile(checkpointPath(), checkpoint);
-        const ResumeEvents events{[this] { ++gathering; },
-                                  [this](const ResumeStart&) { ++continuing; }};
-        result = runResume(folder.path(), stop, nullptr, events);
+        if (records != kNone) writeFile(results, records);
+        if (checkpoint == kFolder) std::filesystem::create_directory(ini);
+        if (checkpoint != kNone && checkpoint != kFolder) writeFile(ini, checkpoint);
+        result = runResume(folder.path(), stop, nullptr,
+                           {[this] { ++gathering; }, [this](const ResumeStart&) { ++continuing; }});
     }
 };
 
@@ -52,17 +50,15 @@ TEST(ResumeJob, StoppedJobsEndWithTheFileOfOneUninterruptedJob) {
         bool enumerated;
         std::string tail;  // past the checkpoint
     };
-    std::vector<Case> cases{{37, 1000, false, ""}, {127, 127, false, ""}, {97, 1000, true, ""}};
     // 127/127: stopped in the last turn at the limit, no turn runs; 97 enumerated: the serial
     // numbers run on, 25;97 then 26;101. Then what a job killed between two checkpoints leaves
     // past the last one: records and a torn line, here one longer than a read block.
-    for (const std::string tail : {"4", "41\r", "41\r\n43\r\n47\r\n", "41\r\n43\r\n4"})
+    std::vector<Case> cases{{127, 127, false, ""}, {37, 1000, true, "13;41\r\n14;43\r\n15;"}};
+    for (const std::string& tail :
+         {std::string("41\r"), std::string("41\r\n43\r\n4"), std::string(3 << 20, '9')})
         cases.push_back({37, 1000, false, tail});
-    for (const std::string tail : {"13;4", "13;41\r\n14;43\r\n15;"})
-        cases.push_back({37, 1000, true, tail});
-    cases.push_back({37, 1000, false, std::string(3 << 20, '9')});
     for (const bool enumerated : {false, true}) {
-        for (const std::int64_t point : {7, 37, 67, 97, 997, 2017, 4987})
+        for (const std::int64_t point : {7, 97, 4987})
             cases.push_back({point, 5000, enumerated, ""});
         // 2999977 = 30 * 99999 + 7, over two MiB into the file.
         const std::string all = oracleResults(3'000'000, enumerated);
@@ -76,8 +72,8 @@ TEST(ResumeJob, StoppedJobsEndWithTheFileOfOneUninterruptedJob) {
                        oracleCheckpoint(c.point, c.limit, 1), StopSignal{});
         ASSERT_EQ(r.result.status, Status::Completed) << r.result.message;
         EXPECT_EQ(r.gathering + r.continuing, 2);
-        EXPECT_TRUE(sameText(readFile(r.resultsPath()), oracleResults(c.limit, c.enumerated)));
-        EXPECT_EQ(readFile(r.checkpointPath()), completeCheckpoint(c.limit));
+        EXPECT_TRUE(sameText(readFile(r.results), oracleResults(c.limit, c.enumerated)));
+        EXPECT_EQ(readFile(r.ini), completeCheckpoint(c.limit));
         EXPECT_EQ(r.result.job.primeCount, primeCount(c.limit));
     }
 }
@@ -109,7 +105,6 @@ TEST(ResumeJob, FilesThatCannotBeTrustedAreLeftUnchanged) {
         {"garbage", 'c', "three readable numbers", good, "garbage\r\n"},
         {"checkpoint is a folder", 'c', "cannot be read (Is a directory)", good, kFolder},
         {"not 30k+7", 'c', "30k + 7", good, oracleCheckpoint(38, 1000, 1)},
-        {"negative candidate", 'c', "30k + 7", good, "-23  1000  1 \r\n"},
         {"limit out of range", 'c', "922337203685277", good,
          oracleCheckpoint(37, 922337203685477, 1)},
         {"missing results file", 'r', "cannot be read", kNone},
@@ -131,15 +126,15 @@ TEST(ResumeJob, FilesThatCannotBeTrustedAreLeftUnchanged) {
                                                                           : Status::Refused);
         if (c.named == 'c' || c.named == 'r') {
             EXPECT_NE(r.result.message.find(c.expected), std::string::npos) << r.result.message;
-            const std::string file = c.named == 'r' ? r.resultsPath() : r.checkpointPath();
+            const std::string file = c.named == 'r' ? r.results : r.ini;
             EXPECT_NE(r.result.message.find(file), std::string::npos) << r.result.message;
         } else {
             EXPECT_EQ(r.result.message, c.expected);
         }
         EXPECT_EQ(r.gathering, c.named == 'r' || c.named == 's' ? 1 : 0);
         EXPECT_EQ(r.continuing, 0);
-        EXPECT_TRUE(sameText(contents(r.resultsPath()), c.records));
-        EXPECT_EQ(contents(r.checkpointPath()), c.checkpoint);
+        EXPECT_TRUE(sameText(contents(r.results), c.records));
+        EXPECT_EQ(contents(r.ini), c.checkpoint);
     }
 }
 
