@@ -32,7 +32,7 @@ inline std::string oracleResults(std::int64_t upTo, bool enumerated) {
 inline std::string oracleCheckpoint(std::int64_t candidate, std::int64_t limit, int interrupted) {
     std::string line;
     for (const std::int64_t field : {candidate, limit, std::int64_t{interrupted}})
-        line += " " + std::to_string(field) + " ";
+        line.append(" ").append(std::to_string(field)).append(" ");
     return line + "\r\n";
 }
 

@@ -54,7 +54,7 @@ using Random = std::mt19937_64;
 std::int64_t uniform(Random& random, std::int64_t low, std::int64_t high) {
     return std::uniform_int_distribution<std::int64_t>(low, high)(random);
 }
-std::int64_t power10(int digits) { return std::stoll("1" + std::string(digits, '0')); }
+std::int64_t power10(int digits) { return digits == 0 ? 1 : 10 * power10(digits - 1); }
 
 enum Damage { None, Drop, Repeat, Long, Replace, Insert, Erase, Torn };
 
