@@ -1,4 +1,5 @@
-// The entry rule and the Number type's conversions and text forms.
+// The entry rule and the Number type's conversions and text forms (the conversion without the
+// range: split_entry_test.cpp, through its only caller).
 #include "core/entry.hpp"
 
 #include <gtest/gtest.h>
@@ -32,14 +33,6 @@ TEST(EntryRule, AcceptsAndTruncatesInsideTheRangeCheckedFirstAndRefusesTheRest) 
     EXPECT_EQ(entry("100.9", ','), "100");
     EXPECT_EQ(entry("1,99", ','), range);
     EXPECT_EQ(entry("100,9", '.'), invalid);
-}
-
-TEST(WholeEntry, ConvertsWithoutTheRangeAndReportsOverflowApart) {
-    EXPECT_EQ(readWholeEntry("999.9").number->whole(), 999);
-    EXPECT_EQ(readWholeEntry("-5").number->whole(), -5);
-    EXPECT_EQ(readWholeEntry("x").message, kInvalidEntryMessage);
-    const EntryResult huge = readWholeEntry("1e30");
-    EXPECT_TRUE(!huge.accepted() && huge.message.empty());
 }
 
 TEST(NumberType, ConversionsAreExactOverflowIsRefusedAndTheTextsHaveTheirForms) {
