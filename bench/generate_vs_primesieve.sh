@@ -16,7 +16,7 @@ cores=$(nproc)
 threadCounts=(1 2 "$cores")
 [ "$cores" -le 2 ] && threadCounts=(1 2)
 declare -A times
-t=() n=()
+t=()
 ourPeak=0
 for _ in 1 2 3; do
     for k in "${threadCounts[@]}"; do
@@ -24,7 +24,6 @@ for _ in 1 2 3; do
         [ "$peak" -gt "$ourPeak" ] && ourPeak=$peak
     done
     theirs; t+=("$wall")
-    ours --no-sync; n+=("$wall")
 done
 ourBytes=$(stat -c %s "$work/primes.txt")
 theirBytes=$(stat -c %s "$work/primesieve.txt")
@@ -32,7 +31,7 @@ if ! tr -d '\r' < "$work/primes.txt" | cmp -s - "$work/primesieve.txt"; then
     echo "MISMATCH: the two files name different primes" >&2
     exit 1
 fi
-bt=$(best "${t[@]}") bn=$(best "${n[@]}")
+bt=$(best "${t[@]}")
 printf 'limit %s, %s cores; primesieve -p: %.2f s (%.0f MB/s)\n' "$limit" "$cores" "$bt" \
     "$(awk -v b="$theirBytes" -v s="$bt" 'BEGIN { print b / s / 1e6 }')"
 printf '%-9s %8s %8s %12s\n' threads seconds MB/s ours/theirs
@@ -43,7 +42,6 @@ for k in "${threadCounts[@]}"; do
         'BEGIN { printf "%-9s %8.2f %8.0f %12.2f\n", k, bo, ob / bo / 1e6, bo / bt }'
 done
 printf 'tarn-cli peak memory: %.1f MiB\n' "$(awk -v p="$ourPeak" 'BEGIN { print p / 1024 }')"
-printf 'all threads without the periodic flush and checkpoint: %.2f s\n' "$bn"
 
 if [ "${TARN_BENCH_BIG:-0}" = 1 ]; then
     rm -f "$work/primes.txt" "$work/primesieve.txt"

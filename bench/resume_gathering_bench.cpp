@@ -15,7 +15,7 @@
 
 #include "core/file_names.hpp"
 #include "generation/generation_job.hpp"
-#include "generation/results_scan.hpp"
+#include "generation/scan/results_scan.hpp"
 #include "platform/files.hpp"
 
 namespace {
@@ -53,9 +53,7 @@ struct JobFile {
         spec.folder = folder;
         spec.limit = upTo;
         spec.enumerated = enumerated;
-        tarn::JobHooks hooks;
-        hooks.durable = false;  // the file only has to reach the page cache
-        const auto result = tarn::runJob(spec, tarn::StopSignal{}, nullptr, hooks);
+        const auto result = tarn::runJob(spec, tarn::StopSignal{}, nullptr);
         if (result.status != tarn::JobResult::Status::Completed) std::abort();
         bytes = readAll(path);
     }

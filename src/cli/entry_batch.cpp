@@ -4,15 +4,15 @@
 #include <cstdio>
 #include <string_view>
 
+#include "cli/config.hpp"
 #include "cli/input_lines.hpp"
 #include "cli/standard_output.hpp"
+#include "cli/texts.hpp"
 #include "core/entry.hpp"
 #include "platform/process.hpp"
 
 namespace tarn::cli {
 namespace {
-
-constexpr std::size_t kFlushSize = 1 << 16;
 
 class Batch {
 public:
@@ -69,12 +69,10 @@ private:
 // long to be an entry is refused by its number without being held.
 void readLines(Batch& batch, Context& ctx) {
     InputLines lines([&batch](std::int64_t number, std::string_view line, bool tooLong) {
-        return tooLong
-                   ? batch.refuse("Line " + std::to_string(number) + " is longer than " +
-                                  std::to_string(kLongestInputLine) + " characters: passed over.")
-                   : batch.entry(line);
+        return tooLong ? batch.refuse(longLineRefusal(number, kLongestInputLine))
+                       : batch.entry(line);
     });
-    char block[1 << 16];
+    char block[kInputBlock];
     for (;;) {
         int error = 0;
         const std::ptrdiff_t got = platform::readInput(block, sizeof block, error);

@@ -8,8 +8,8 @@
 #include "cli/job_report.hpp"
 #include "cli/progress_line.hpp"
 #include "generation/generation_job.hpp"
-#include "generation/job_texts.hpp"
 #include "generation/limit_entry.hpp"
+#include "generation/texts.hpp"
 
 namespace tarn::cli {
 
@@ -17,9 +17,7 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
     struct Options {
         std::string limit;
         bool enumerate = false;
-        bool noSync = false;
-        int threads = 0;
-        JobHooks hooks;
+        JobOptions job;
     };
     auto options = std::make_shared<Options>();
 
@@ -29,10 +27,7 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
         ->required();
     generate->add_flag("--enumerate", options->enumerate,
                        "Write records as serial number;prime (5;11)");
-    // Measurements only: leaves out the periodic flush to the disk and its checkpoints.
-    generate->add_flag("--no-sync", options->noSync)->group("");
-    addThreadsOption(*generate, options->threads);
-    addCheckpointIntervalOption(*generate, options->hooks);
+    addThreadsOption(*generate, options->job.threads);
     generate->callback([&ctx, options] {
         const EntryResult entry = readLimitEntry(options->limit);
         if (!entry.accepted()) {
@@ -46,15 +41,12 @@ void registerGenerationCommands(CLI::App& app, Context& ctx) {
         spec.folder = ctx.folder;
         spec.limit = entry.number->whole();
         spec.enumerated = options->enumerate;
-        spec.threads = options->threads;
-        JobHooks hooks = options->hooks;
-        hooks.durable = !options->noSync;
         JobProgress progress;
         ctx.stop.clear();
         JobResult result;
         {
             ProgressLine line(jobSample(progress, 11, spec.limit));
-            result = runJob(spec, ctx.stop, &progress, hooks);
+            result = runJob(spec, ctx.stop, &progress, options->job);
         }
         ctx.exitCode = reportJob(result);
     });

@@ -6,7 +6,7 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/standard_output.hpp"
-#include "generation/job_texts.hpp"
+#include "generation/texts.hpp"
 
 namespace tarn::cli {
 
@@ -29,15 +29,6 @@ int reportJob(const JobResult& result) {
 void addThreadsOption(CLI::App& command, int& threads) {
     command.add_option("--threads", threads, "Sieving threads (default: one per core)")
         ->check(CLI::Range(1, 1024));
-}
-
-void addCheckpointIntervalOption(CLI::App& command, JobHooks& hooks) {
-    command
-        .add_option_function<int>(
-            "--checkpoint-interval",
-            [&hooks](int ms) { hooks.checkpointInterval = std::chrono::milliseconds(ms); })
-        ->check(CLI::Range(0, 3600000))
-        ->group("");
 }
 
 }  // namespace tarn::cli

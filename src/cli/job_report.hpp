@@ -17,8 +17,4 @@ int reportJob(const JobResult& result);
 // --threads N of the job commands.
 void addThreadsOption(CLI::App& command, int& threads);
 
-// A hidden option of the job commands: the interval of the checkpoints during the job, so that
-// tests can kill a job between two of them.
-void addCheckpointIntervalOption(CLI::App& command, JobHooks& hooks);
-
 }  // namespace tarn::cli

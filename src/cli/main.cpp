@@ -7,6 +7,7 @@
 
 #include "cli/cli_context.hpp"
 #include "cli/standard_output.hpp"
+#include "cli/texts.hpp"
 #include "core/app_folder.hpp"
 #include "core/data_folder.hpp"
 #include "core/exception_text.hpp"
@@ -21,8 +22,8 @@ const CLI::Validator kExistingFolder(
         std::error_code ec;
         const std::filesystem::path path = tarn::pathFromUtf8(name);
         if (std::filesystem::is_directory(path, ec)) return std::string();
-        if (std::filesystem::exists(path, ec)) return "Directory is actually a file: " + name;
-        return "Directory does not exist: " + name;
+        if (std::filesystem::exists(path, ec)) return tarn::cli::folderIsAFile(name);
+        return tarn::cli::folderMissing(name);
     },
     "DIR", "DIR");
 

@@ -4,6 +4,7 @@
 #include <chrono>
 #include <cstdio>
 
+#include "cli/config.hpp"
 #include "platform/process.hpp"
 
 namespace tarn::cli {
@@ -38,7 +39,7 @@ ProgressLine::~ProgressLine() {
 void ProgressLine::run() {
     const auto started = std::chrono::steady_clock::now();
     std::unique_lock lock(mutex_);
-    while (!wake_.wait_for(lock, std::chrono::milliseconds(250), [this] { return done_; })) {
+    while (!wake_.wait_for(lock, kProgressInterval, [this] { return done_; })) {
         const ProgressSample now = sample_();
         const double share = std::clamp(now.share, 0.0, 1.0);
         const double seconds =

@@ -9,19 +9,18 @@
 #include "cli/cli_context.hpp"
 #include "cli/job_report.hpp"
 #include "cli/progress_line.hpp"
+#include "cli/texts.hpp"
 #include "generation/resume_job.hpp"
-#include "generation/resume_texts.hpp"
+#include "generation/texts.hpp"
 
 namespace tarn::cli {
 
 void registerResumeCommand(CLI::App& app, Context& ctx) {
     auto* command =
         app.add_subcommand("resume", "Continue the stopped generation job recorded in primes.ini");
-    auto hooks = std::make_shared<JobHooks>();
-    auto threads = std::make_shared<int>(0);
-    addThreadsOption(*command, *threads);
-    addCheckpointIntervalOption(*command, *hooks);
-    command->callback([&ctx, hooks, threads] {
+    auto options = std::make_shared<JobOptions>();
+    addThreadsOption(*command, options->threads);
+    command->callback([&ctx, options] {
         const auto lock = lockFolder(ctx);
         if (!lock) return;
         JobProgress progress;
@@ -32,8 +31,7 @@ void registerResumeCommand(CLI::App& app, Context& ctx) {
             std::cerr << kDoingResumeInfoLine << '\n';
             line.emplace(jobSample(progress, start.resumePoint, start.limit));
         };
-        const ResumeResult result =
-            runResume(ctx.folder, ctx.stop, &progress, events, *hooks, *threads);
+        const ResumeResult result = runResume(ctx.folder, ctx.stop, &progress, events, *options);
         line.reset();
         switch (result.status) {
             case ResumeResult::Status::NothingToResume:

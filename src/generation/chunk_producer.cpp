@@ -33,8 +33,8 @@ int decimalDigits(std::uint64_t n) {
 }  // namespace
 
 ChunkProducer::ChunkProducer(const ChunkPlan& plan, WritePipeline& pipeline, const StopSignal& stop,
-                             const JobHooks& hooks, JobProgress* progress)
-    : plan_(plan), pipeline_(pipeline), stop_(stop), hooks_(hooks), progress_(progress) {}
+                             JobProgress* progress)
+    : plan_(plan), pipeline_(pipeline), stop_(stop), progress_(progress) {}
 
 ChunkProducer::~ChunkProducer() {
     close(false);
@@ -148,7 +148,6 @@ std::int64_t ChunkProducer::sieveChunk(WheelSieve& sieve, const Claim& chunk,
         }
         turn += length;
         length = plan_.segmentTurns;
-        if (hooks_.afterBatch) hooks_.afterBatch(turn - plan_.firstTurn);
         if (pipeline_.failed()) break;
         if (turn < chunk.endTurn && stop_.requested()) break;
     }

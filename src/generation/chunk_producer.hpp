@@ -25,7 +25,7 @@
 #include "core/stop_signal.hpp"
 #include "core/wheel.hpp"
 #include "generation/bucket_sieve.hpp"
-#include "generation/generation_job.hpp"
+#include "generation/job_progress.hpp"
 #include "generation/wheel_sieve.hpp"
 #include "generation/write_pipeline.hpp"
 
@@ -45,7 +45,7 @@ struct ChunkPlan {
 class ChunkProducer {
 public:
     ChunkProducer(const ChunkPlan& plan, WritePipeline& pipeline, const StopSignal& stop,
-                  const JobHooks& hooks, JobProgress* progress);
+                  JobProgress* progress);
     ~ChunkProducer();  // joins the threads
     ChunkProducer(const ChunkProducer&) = delete;
     ChunkProducer& operator=(const ChunkProducer&) = delete;
@@ -80,7 +80,6 @@ private:
     const ChunkPlan plan_;
     WritePipeline& pipeline_;
     const StopSignal& stop_;
-    const JobHooks& hooks_;
     JobProgress* progress_;
 
     // Waits for the group's turn on the chunk, crosses off, and hands the group on; false when

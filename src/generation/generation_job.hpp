@@ -4,24 +4,16 @@
 // existing file from a later turn with the serial numbers running on.
 #pragma once
 
-#include <atomic>
 #include <chrono>
 #include <cstdint>
-#include <functional>
-#include <memory>
 #include <string>
 
 #include "core/stop_signal.hpp"
-#include "generation/checkpoint_file.hpp"
-#include "generation/results_sink.hpp"
+#include "generation/config.hpp"
+#include "generation/job_files.hpp"
+#include "generation/job_progress.hpp"
 
 namespace tarn {
-
-// What a running job shows; the window reads it a few times a second.
-struct JobProgress {
-    std::atomic<std::int64_t> candidate{0};   // start of the wheel turn in progress
-    std::atomic<std::int64_t> primeCount{0};  // records written so far
-};
 
 struct JobSpec {
     std::string folder;        // with one trailing separator
@@ -32,7 +24,6 @@ struct JobSpec {
     bool append = false;
     std::int64_t firstTurn = 11;
     std::int64_t primeCountBefore = 0;
-    int threads = 0;  // sieving threads; 0: one per core
 };
 
 struct JobResult {
@@ -47,37 +38,17 @@ struct JobResult {
     std::string error;  // for Failed: the whole "Info" message, naming the file and the reason
 };
 
-JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress = nullptr);
-
-// Seams of the job for tests and measurements; the defaults are the real job.
-struct JobHooks {
-    // Opens the results file in place of openResultsFile (tests fail it at a chosen byte).
-    std::function<std::unique_ptr<ResultsSink>(const std::string& path, bool append, int& error)>
-        openResults;
-    // Runs on a sieving thread after each batch of wheel turns, before the stop check, with the
-    // count of turns from the job's first turn to the batch's end. The first batch is one turn.
-    // Several threads may call it at once.
-    std::function<void(std::int64_t turnsDone)> afterBatch;
-    // Runs after each checkpoint rewritten during the job, with the results bytes it covers
-    // (all of them flushed to the disk before the checkpoint was written).
-    std::function<void(const Checkpoint& checkpoint, std::uint64_t durableBytes)> afterCheckpoint;
-    // Writes the checkpoint in place of writeCheckpoint (tests fail it); same contract.
-    std::function<std::string(const std::string& path, const Checkpoint& checkpoint)>
-        writeCheckpoint;
-    std::chrono::milliseconds checkpointInterval{2000};
-    std::int64_t turnsPerBatch = 0;  // 0: sized for the first-level cache
-    std::int64_t turnsPerChunk = 0;  // 0: eight batches; each chunk is one write
-    // false: no flush to the disk and no checkpoint during the job (measures their cost).
-    bool durable = true;
+// How a job runs; the defaults are the real job's. Tests make the pieces small, so that stops and
+// failures land among many of them, and stand in for the files.
+struct JobOptions {
+    int threads = 0;  // sieving threads; 0: one per core
+    std::chrono::milliseconds checkpointInterval = kCheckpointInterval;
+    std::int64_t turnsPerBatch = 0;  // 0: kSegmentTurns; the job's first batch is one turn
+    std::int64_t turnsPerChunk = 0;  // 0: kSegmentsPerChunk batches; each chunk is one write
+    JobFiles* files = nullptr;       // nullptr: the real results and checkpoint files
 };
 
-JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress,
-                 const JobHooks& hooks);
-
-// "Done!!! The results were saved in the file <path>. 25 primes found up to number 100...
-// Save the file to other location."
-std::string completionReport(const JobResult& result);
-// "INFO: 25 primes found up to number 100..."
-std::string completionInfoLine(const JobResult& result);
+JobResult runJob(const JobSpec& spec, const StopSignal& stop, JobProgress* progress = nullptr,
+                 const JobOptions& options = {});
 
 }  // namespace tarn

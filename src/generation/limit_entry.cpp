@@ -1,6 +1,6 @@
 #include "generation/limit_entry.hpp"
 
-#include "generation/job_texts.hpp"
+#include "generation/texts.hpp"
 
 namespace tarn {
 

@@ -13,26 +13,6 @@ namespace {
 constexpr std::uint64_t kLongestRecord = 32;  // 14-digit serial, ';', 15-digit prime, CR LF
 }
 
-std::string resultsChangeMessage(const std::string& path, const FileCheck& check,
-                                 std::uint64_t written) {
-    const std::string file = "The file " + path;
-    switch (check.change) {
-        case FileCheck::Change::Gone:
-            return file + " was deleted while the job was writing it. The job stopped; generate " +
-                   "the primes again.";
-        case FileCheck::Change::Replaced:
-            return file + " was replaced by another file while the job was writing it. The job " +
-                   "stopped; generate the primes again.";
-        case FileCheck::Change::Resized:
-            return file + " holds " + std::to_string(check.bytes) + " bytes, but the job had " +
-                   "written " + std::to_string(written) + ": it was cut or changed while the " +
-                   "job was writing it. The job stopped and kept the records it could vouch for.";
-        case FileCheck::Change::None:
-            break;
-    }
-    return fileReadFailure(path, systemReason(check.error));
-}
-
 std::optional<KeptRecords> keptRecords(const std::string& path, std::uint64_t trusted,
                                        std::int64_t limit) {
     const std::uint64_t from = trusted - std::min(trusted, 2 * kLongestRecord);

@@ -1,5 +1,5 @@
-// A results file deleted, replaced, cut or grown under a running job: what to tell the user, and
-// what of a resized file a resume can still continue.
+// A results file cut or grown under a running job: what of it a resume can still continue (what
+// to tell the user: texts.hpp).
 #pragma once
 
 #include <cstdint>
@@ -10,11 +10,6 @@
 #include "generation/results_sink.hpp"
 
 namespace tarn {
-
-// "The file <path> was deleted while the job was writing it. ..." and the like; `written` is
-// what the job had written when it looked.
-std::string resultsChangeMessage(const std::string& path, const FileCheck& check,
-                                 std::uint64_t written);
 
 struct KeptRecords {
     std::uint64_t bytes = 0;  // where the last whole record ends

@@ -8,8 +8,8 @@
 #include "core/texts.hpp"
 #include "core/wheel.hpp"
 #include "generation/checkpoint_file.hpp"
-#include "generation/results_scan.hpp"
-#include "generation/resume_texts.hpp"
+#include "generation/scan/results_scan.hpp"
+#include "generation/texts.hpp"
 #include "platform/files.hpp"
 
 namespace tarn {
@@ -46,14 +46,14 @@ ResumeResult stoppedWhileGathering(const std::string& resultsPath, std::int64_t 
 }
 
 ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                    const ResumeEvents& events, const JobHooks& hooks, int threads);
+                    const ResumeEvents& events, const JobOptions& options);
 
 }  // namespace
 
 ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                       const ResumeEvents& events, const JobHooks& hooks, int threads) {
+                       const ResumeEvents& events, const JobOptions& options) {
     try {
-        return resume(folder, stop, progress, events, hooks, threads);
+        return resume(folder, stop, progress, events, options);
     } catch (...) {
         // Reading and checking change no file, and the job guards its own writes.
         return failed(unexpectedFailure(describeCurrentException()), resultsFilePath(folder));
@@ -63,7 +63,7 @@ ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobPro
 namespace {
 
 ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                    const ResumeEvents& events, const JobHooks& hooks, int threads) {
+                    const ResumeEvents& events, const JobOptions& options) {
     const std::string checkpointPath = checkpointFilePath(folder);
     const std::string resultsPath = resultsFilePath(folder);
 
@@ -114,10 +114,9 @@ ResumeResult resume(const std::string& folder, const StopSignal& stop, JobProgre
     spec.append = true;
     spec.firstTurn = resumePoint + kLastToNextTurn;
     spec.primeCountBefore = scan.records;
-    spec.threads = threads;
 
     ResumeResult result;
-    result.job = runJob(spec, stop, progress, hooks);
+    result.job = runJob(spec, stop, progress, options);
     switch (result.job.status) {
         case JobResult::Status::Completed:
             result.status = ResumeResult::Status::Completed;

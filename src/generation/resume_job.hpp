@@ -33,10 +33,9 @@ struct ResumeResult {
     JobResult job;        // Completed / Stopped / Failed from the engine
 };
 
-// Called on a worker thread; the events are called from that thread. `threads` as for a job. The
-// caller clears `stop` before; a stop while the results file is read ends with Stopped and changes
-// no file.
+// Called on a worker thread; the events are called from that thread. The caller clears `stop`
+// before; a stop while the results file is read ends with Stopped and changes no file.
 ResumeResult runResume(const std::string& folder, const StopSignal& stop, JobProgress* progress,
-                       const ResumeEvents& events, const JobHooks& hooks = {}, int threads = 0);
+                       const ResumeEvents& events, const JobOptions& options = {});
 
 }  // namespace tarn

@@ -7,7 +7,7 @@
 namespace tarn {
 
 struct StartupCheck {
-    bool showInterruptedPrompt = false;  // show kInterruptedPrompt (resume_texts.hpp)
+    bool showInterruptedPrompt = false;  // show kInterruptedPrompt (generation/texts.hpp)
     // "The file <path> could not be read: <reason>." when the checkpoint is there but could not
     // be read; shown as an "Info" message. Empty otherwise.
     std::string readFailure{};

@@ -4,12 +4,6 @@
 
 namespace tarn {
 
-std::string saveCheckpoint(const JobHooks& hooks, const std::string& path,
-                           const Checkpoint& checkpoint) {
-    return hooks.writeCheckpoint ? hooks.writeCheckpoint(path, checkpoint)
-                                 : writeCheckpoint(path, checkpoint);
-}
-
 char* RecordBuffer::reserve(std::size_t bytes) {
     if (bytes > capacity) {
         data.reset();  // the old storage goes before the new one comes
@@ -19,13 +13,11 @@ char* RecordBuffer::reserve(std::size_t bytes) {
     return data.get();
 }
 
-WritePipeline::WritePipeline(ResultsSink& sink, const JobHooks& hooks, std::string checkpointPath,
-                             std::int64_t limit, int bufferCount, FileMark start,
-                             JobProgress* progress)
+WritePipeline::WritePipeline(ResultsSink& sink, JobFiles& files, CheckpointPlan checkpoints,
+                             int bufferCount, FileMark start, JobProgress* progress)
     : sink_(sink),
-      hooks_(hooks),
-      checkpointPath_(std::move(checkpointPath)),
-      limit_(limit),
+      files_(files),
+      checkpoints_(std::move(checkpoints)),
       progress_(progress),
       buffers_(static_cast<std::size_t>(bufferCount)),
       written_(start),
@@ -37,13 +29,11 @@ WritePipeline::~WritePipeline() { finish(); }
 
 void WritePipeline::start() {
     writer_ = std::thread([this] { writeLoop(); });
-    if (hooks_.durable) {
-        try {
-            checkpointer_ = std::thread([this] { checkpointLoop(); });
-        } catch (...) {
-            fail({PipelineFailure::Kind::Internal, 0, describeCurrentException()});
-            throw;
-        }
+    try {
+        checkpointer_ = std::thread([this] { checkpointLoop(); });
+    } catch (...) {
+        fail({PipelineFailure::Kind::Internal, 0, describeCurrentException()});
+        throw;
     }
 }
 
@@ -130,7 +120,7 @@ void WritePipeline::writeOne(RecordBuffer& b) {
             fail({PipelineFailure::Kind::Write, error, {}});
             return;
         }
-        if (hooks_.durable) sink_.startWriteback(offset, b.size);
+        sink_.startWriteback(offset, b.size);
         if (const FileCheck check = sink_.check();
             check.change != FileCheck::Change::None || check.error != 0) {
             fail({PipelineFailure::Kind::Changed, check.error, {}, check});
@@ -147,7 +137,7 @@ void WritePipeline::writeOne(RecordBuffer& b) {
 
 void WritePipeline::checkpointLoop() {
     // The first flush comes as soon as there is something written: the seed records.
-    auto lastFlush = std::chrono::steady_clock::now() - hooks_.checkpointInterval;
+    auto lastFlush = std::chrono::steady_clock::now() - checkpoints_.interval;
     try {
         while (checkpointOnce(lastFlush)) {
         }
@@ -165,7 +155,7 @@ bool WritePipeline::checkpointOnce(std::chrono::steady_clock::time_point& lastFl
             if (writerDone_ || failed()) return false;
             const bool news =
                 written_.bytes > durable_.bytes || written_.candidate > durable_.candidate;
-            const auto due = lastFlush + hooks_.checkpointInterval;
+            const auto due = lastFlush + checkpoints_.interval;
             if (news && std::chrono::steady_clock::now() >= due) break;
             if (news)
                 changed_.wait_until(lock, due);
@@ -185,8 +175,9 @@ bool WritePipeline::checkpointOnce(std::chrono::steady_clock::time_point& lastFl
         fail({PipelineFailure::Kind::Changed, check.error, {}, check});
         return false;
     }
-    const Checkpoint checkpoint{mark.candidate, limit_, 1};
-    if (std::string reason = saveCheckpoint(hooks_, checkpointPath_, checkpoint); !reason.empty()) {
+    const Checkpoint checkpoint{mark.candidate, checkpoints_.limit, 1};
+    if (std::string reason = files_.saveCheckpoint(checkpoints_.path, checkpoint);
+        !reason.empty()) {
         fail({PipelineFailure::Kind::Checkpoint, 0, std::move(reason)});
         return false;
     }
@@ -194,7 +185,6 @@ bool WritePipeline::checkpointOnce(std::chrono::steady_clock::time_point& lastFl
         std::lock_guard lock(mutex_);
         durable_ = mark;
     }
-    if (hooks_.afterCheckpoint) hooks_.afterCheckpoint(checkpoint, mark.bytes);
     return true;
 }
 

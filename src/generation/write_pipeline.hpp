@@ -22,7 +22,8 @@
 #include <thread>
 #include <vector>
 
-#include "generation/generation_job.hpp"
+#include "generation/job_files.hpp"
+#include "generation/job_progress.hpp"
 
 namespace tarn {
 
@@ -56,14 +57,17 @@ struct PipelineFailure {
     FileCheck check{};   // Changed: what became of the file
 };
 
-// Rewrites the checkpoint through the job's hook, or for real.
-std::string saveCheckpoint(const JobHooks& hooks, const std::string& path,
-                           const Checkpoint& checkpoint);
+// Where and how often the checkpoints during the job go.
+struct CheckpointPlan {
+    std::string path;
+    std::int64_t limit = 0;
+    std::chrono::milliseconds interval{};
+};
 
 class WritePipeline {
 public:
-    WritePipeline(ResultsSink& sink, const JobHooks& hooks, std::string checkpointPath,
-                  std::int64_t limit, int bufferCount, FileMark start, JobProgress* progress);
+    WritePipeline(ResultsSink& sink, JobFiles& files, CheckpointPlan checkpoints, int bufferCount,
+                  FileMark start, JobProgress* progress);
     ~WritePipeline();  // finishes first when a producer left by an exception
     WritePipeline(const WritePipeline&) = delete;
     WritePipeline& operator=(const WritePipeline&) = delete;
@@ -93,9 +97,8 @@ private:
     bool checkpointOnce(std::chrono::steady_clock::time_point& lastFlush);
 
     ResultsSink& sink_;
-    const JobHooks& hooks_;
-    const std::string checkpointPath_;
-    const std::int64_t limit_;
+    JobFiles& files_;
+    const CheckpointPlan checkpoints_;
     JobProgress* progress_;
 
     std::mutex mutex_;

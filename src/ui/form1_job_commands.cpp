@@ -2,11 +2,10 @@
 // times a second and reports its outcome once the worker has finished with the files.
 #include <QProgressBar>
 
-#include "generation/job_texts.hpp"
 #include "generation/limit_entry.hpp"
 #include "generation/resume_job.hpp"
-#include "generation/resume_texts.hpp"
 #include "generation/startup_check.hpp"
+#include "generation/texts.hpp"
 #include "ui/config.hpp"
 #include "ui/decimal_separator.hpp"
 #include "ui/form1.hpp"

@@ -5,7 +5,7 @@
 #include "core/factorization.hpp"
 #include "core/texts.hpp"
 #include "core/trial_division.hpp"
-#include "generation/job_texts.hpp"
+#include "generation/texts.hpp"
 #include "ui/decimal_separator.hpp"
 #include "ui/form1.hpp"
 #include "ui/message_box.hpp"

@@ -15,16 +15,17 @@
 
 namespace tarn::test {
 
-// Waits (20 s at most) until the file at `path` holds more than `bytes` bytes; a file that is
-// not there yet holds none.
+// The bytes in a file; a file that is not there yet holds none.
+inline std::uintmax_t sizeOf(const std::string& path) {
+    std::error_code error;
+    const auto got = std::filesystem::file_size(pathFromUtf8(path), error);
+    return error ? 0 : got;
+}
+
+// Waits (20 s at most) until the file at `path` holds more than `bytes` bytes.
 inline void waitForGrowth(const std::string& path, std::uintmax_t bytes) {
     const auto until = std::chrono::steady_clock::now() + std::chrono::seconds(20);
-    const auto size = [&] {
-        std::error_code error;
-        const auto got = std::filesystem::file_size(pathFromUtf8(path), error);
-        return error ? 0 : got;
-    };
-    while (size() <= bytes && std::chrono::steady_clock::now() < until)
+    while (sizeOf(path) <= bytes && std::chrono::steady_clock::now() < until)
         std::this_thread::sleep_for(std::chrono::milliseconds(2));
 }
 
@@ -47,6 +48,17 @@ public:
                        outputFolder + "cli.err"),
           outPath_(outputFolder + "cli.out"),
           errPath_(outputFolder + "cli.err") {}
+
+    // Waits for the end, killing a child that writes more than a test ever reads: a program that
+    // loops on its output must fail the test, not fill the disk.
+    int wait() {
+        constexpr std::uintmax_t kCaptureLimit = 8u << 20;
+        while (!finished()) {
+            if (sizeOf(outPath_) > kCaptureLimit || sizeOf(errPath_) > kCaptureLimit) kill();
+            std::this_thread::sleep_for(std::chrono::milliseconds(1));
+        }
+        return ChildProcess::wait();
+    }
 
     // Waits until the child has written something to standard output, so that a signal lands
     // inside its work however slowly the program starts (sanitizer builds on a busy machine).

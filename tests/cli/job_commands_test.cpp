@@ -10,6 +10,7 @@
 
 #include "cli/cli_child.hpp"
 #include "generation/results_oracle.hpp"
+#include "generation/texts.hpp"
 
 namespace tarn {
 namespace {
@@ -26,7 +27,8 @@ struct Cli {
     }
 };
 
-const std::string kResumeNotes = "INFO: Gathering information...\nINFO: Doing resume...\n";
+const std::string kResumeNotes =
+    std::string(kGatheringInfoLine) + "\n" + std::string(kDoingResumeInfoLine) + "\n";
 
 TEST(JobCommands, ReportsGoToStdoutRefusalsToStderrWithTheirExitCodes) {
     struct Case {
@@ -37,13 +39,11 @@ TEST(JobCommands, ReportsGoToStdoutRefusalsToStderrWithTheirExitCodes) {
     };
     const std::string stopped = oracleResults(97, true), at97 = oracleCheckpoint(97, 1000, 1);
     const std::string beyond = oracleResults(127, false);
-    const std::string impossible =
-        "Impossible to resume! Some error must have ocuured. To Resume you must Cancel the "
-        "Calculations.\n";
+    const std::string impossible = std::string(kImpossibleToResumeMessage) + "\n";
     const Case cases[] = {
         {{"generate", "100.9", "--enumerate"}, "", "", 0, "25 primes found up to number 100", ""},
         {{"resume"}, stopped, at97, 0, "168 primes found up to number 1000", kResumeNotes},
-        {{"generate", "99.9"}, "", "", 2, "", "Minimum value is 100\n"},
+        {{"generate", "99.9"}, "", "", 2, "", std::string(kMinimumMessage) + "\n"},
         {{"generate", "abc"}, "", "", 2, "", "Invalid entry.\n"},
         {{"resume"}, "", "", 2, "", "Nothing to resume.\n"},
         {{"resume"}, beyond, " 127  105  1 \r\n", 2, "", impossible}};
@@ -88,7 +88,8 @@ TEST(JobCommands, TerminationStopsTheJobWithExitCodeThree) {
         const bool sent = resume ? child.hangUp() : child.terminate();
         if (!sent) GTEST_SKIP() << "no console events (Wine: stop_under_wine.sh)";
         EXPECT_EQ(child.wait(), 3) << child.err();
-        EXPECT_EQ(child.err(), (resume ? kResumeNotes : "") + "All calculations were stopped!\n");
+        EXPECT_EQ(child.err(),
+                  (resume ? kResumeNotes : "") + std::string(kAllStoppedMessage) + "\n");
         EXPECT_EQ(child.out(), "");
     }
 }

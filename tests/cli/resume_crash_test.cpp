@@ -1,7 +1,8 @@
 // Kill tests: tarn-cli generate and resume are killed at random moments, then
 // resumed until the job completes; the results file must be byte for byte that of one
-// uninterrupted run. A kill before the first periodic checkpoint leaves nothing to resume, and
-// then the job is simply started again.
+// uninterrupted run. Each run checkpoints as soon as its first records are written, so a kill
+// after that leaves a torn file to resume; a kill before it leaves nothing to resume, and then
+// the job is simply started again.
 #include <gtest/gtest.h>
 
 #include <algorithm>
@@ -19,11 +20,9 @@ namespace {
 using namespace test;
 
 TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
-    // Kills land anywhere inside a job, with checkpoints every 20 ms so that resumes start from
-    // all over the file. The reference run says how long a whole job takes in this build on this
-    // machine, and a run of --version how long the program takes just to start.
+    // Kills land anywhere inside a job. The reference run says how long a whole job takes in
+    // this build on this machine, and a run of --version how long the program takes just to start.
     const std::string limit = "100000000";
-    const std::string interval = "--checkpoint-interval=20";
     TempFolder reference, output;
     const auto timed = [&](std::vector<std::string> args) {
         const auto launch = std::chrono::steady_clock::now();
@@ -52,11 +51,11 @@ TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
             resumes += resume;
             // One sieving thread, two, and more than the cores, in turn.
             const std::string threads = "--threads=" + std::to_string((run + attempt) % 3 * 2 + 1);
-            CliChild child(resume ? std::vector<std::string>{"--folder", folder.path(), "resume",
-                                                             interval, threads}
-                                  : std::vector<std::string>{"--folder", folder.path(), "generate",
-                                                             limit, interval, threads},
-                           output.path());
+            CliChild child(
+                resume ? std::vector<std::string>{"--folder", folder.path(), "resume", threads}
+                       : std::vector<std::string>{"--folder", folder.path(), "generate", limit,
+                                                  threads},
+                output.path());
             // Then let it run to its end; while no kill has yet left a job to resume (a start-up
             // slower than the one measured, as under an emulator), kill on a little longer.
             const bool kill = attempt < 4 || (resumes == 0 && attempt < 12);

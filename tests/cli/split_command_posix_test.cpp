@@ -1,5 +1,7 @@
-// tarn-cli split reading a pipe in the results file's place: stopped by Ctrl-C while it waits,
-// and its progress line on a terminal (POSIX: named pipes, signals, pseudo-terminals).
+// tarn-cli split reading a pipe in the results file's place, and factorize reading a pipe on
+// standard input: stopped by Ctrl-C while they wait; the split's progress line on a terminal
+// (POSIX: named pipes, signals, pseudo-terminals).
+#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <pty.h>
@@ -50,6 +52,28 @@ TEST_F(SplitInterrupt, CtrlCStopsBetweenRecordsWithExitCodeThree) {
     const std::string printed = child.out();
     EXPECT_TRUE(printed.starts_with("Done!!! ") && printed.ends_with(" files were created.\n"))
         << printed;
+}
+
+TEST_F(SplitInterrupt, CtrlCEndsABatchWaitingForStandardInputWithExitCodeThree) {
+    const std::string input = data.path() + "in";
+    ASSERT_EQ(mkfifo(input.c_str(), 0600), 0);
+    // Open for both, so that neither this open nor the child's waits for the other end.
+    const int feed = open(input.c_str(), O_RDWR);
+    ASSERT_GE(feed, 0);
+    CliChild child({"factorize"}, scratch.path(), input);
+    // Lines whose answers just fill a block of output (64 KiB), so that all show before it waits
+    // for more.
+    std::string lines, factors;
+    for (int i = 0; i < 3277; ++i) lines += "360\n", factors += "360 = 2^3 * 3^2 * 5\n";
+    ASSERT_EQ(write(feed, lines.data(), lines.size()), static_cast<ssize_t>(lines.size()));
+    waitForGrowth(scratch.path() + "cli.out", factors.size() - 1);
+    for (int tries = 0; tries < 100 && !child.finished(); ++tries) {
+        if (tries % 10 == 0) child.interrupt();
+        usleep(10000);
+    }
+    close(feed);
+    EXPECT_EQ(child.wait(), 3);
+    EXPECT_EQ(child.out(), factors);
 }
 
 TEST_F(SplitInterrupt, ShowsProgressOnATerminal) {

@@ -7,8 +7,8 @@
 #include <string_view>
 
 #include "fuzz_check.hpp"
-#include "generation/results_line_check.hpp"
-#include "generation/results_scan.hpp"
+#include "generation/scan/line_check.hpp"
+#include "generation/scan/results_scan.hpp"
 #include "support/temp_folder.hpp"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {

@@ -1,9 +1,7 @@
 // The generation job against the oracle: byte-for-byte results files and checkpoint lines for
-// complete runs, stops after a chosen turn, continued (appended) runs, the checkpoints written
-// while the job runs, and write failures: a results file that fills up at a chosen byte or sits
-// on a full device, a folder that is not there, a checkpoint that cannot be rewritten. A failed
-// job must name the file and the reason, and leave a checkpoint that describes what the results
-// file really holds, so that a continued job completes it exactly.
+// complete runs, stops at a chosen point, continued (appended) runs, the checkpoints written
+// while the job runs, and failures of the real file system (injected faults have a table of
+// their own). A failed job must name the file and the reason.
 #include "generation/generation_job.hpp"
 
 #include <gmock/gmock.h>
@@ -13,9 +11,12 @@
 #include <cerrno>
 #include <filesystem>
 #include <random>
+#include <stdexcept>
 #include <thread>
 
+#include "core/texts.hpp"
 #include "generation/results_oracle.hpp"
+#include "generation/sink_relay.hpp"
 #include "support/temp_folder.hpp"
 
 namespace tarn {
@@ -31,10 +32,10 @@ struct JobRun {
     std::string results, checkpoint;
 };
 
-JobRun runIn(const TempFolder& folder, JobSpec spec, const JobHooks& hooks = {},
+JobRun runIn(const TempFolder& folder, JobSpec spec, const JobOptions& options = {},
              const StopSignal& stop = StopSignal{}) {
     spec.folder = folder.path();
-    JobResult result = runJob(spec, stop, nullptr, hooks);
+    JobResult result = runJob(spec, stop, nullptr, options);
     return {result, readFile(folder.path() + "primes.txt"), readFile(folder.path() + "primes.ini")};
 }
 
@@ -45,13 +46,11 @@ void expectComplete(const JobRun& r, std::int64_t limit, bool enumerated) {
     EXPECT_EQ(r.result.primeCount, primeCount(limit));
 }
 
-void expectComplete(std::int64_t limit, bool enumerated, int threads, const JobHooks& hooks = {}) {
+void expectComplete(std::int64_t limit, bool enumerated, JobOptions options) {
     SCOPED_TRACE("limit " + std::to_string(limit) + (enumerated ? " enumerated " : " plain ") +
-                 std::to_string(threads) + " threads");
+                 std::to_string(options.threads) + " threads");
     TempFolder folder;
-    JobSpec spec{"", limit, enumerated};
-    spec.threads = threads;
-    expectComplete(runIn(folder, spec, hooks), limit, enumerated);
+    expectComplete(runIn(folder, {"", limit, enumerated}, options), limit, enumerated);
 }
 
 TEST(GenerationJob, CompleteRunsMatchTheOracle) {
@@ -60,23 +59,21 @@ TEST(GenerationJob, CompleteRunsMatchTheOracle) {
     for (const std::int64_t limit :
          {100, 110, 997, 1000, 1206, 1207, 1208, 1210, 1211, 1212, 30 * 331 + 7, 30 * 331 + 11})
         for (const bool enumerated : {false, true})
-            expectComplete(limit, enumerated, threads++ % 3 + 1);
+            expectComplete(limit, enumerated, {threads++ % 3 + 1});
     // The first batch is one turn, the next ones 32768 turns, a chunk 4 batches: edges of the
     // first batch and of the first chunk.
     for (const std::int64_t turns : {32769, 4 * 32768}) {
         const std::int64_t edge = 30 * turns + 11;
         for (const std::int64_t limit : {edge - 1, edge})
-            expectComplete(limit, limit % 2 == 0, threads++ % 3 + 1);
+            expectComplete(limit, limit % 2 == 0, {threads++ % 3 + 1});
     }
     // Many small chunks for more threads than cores, each waiting for the serial numbers of the
     // one before.
-    JobHooks small;
-    small.turnsPerBatch = 7;
-    small.turnsPerChunk = 50;
-    for (const int many : {2, 3, 8}) expectComplete(300'007, true, many, small);
+    for (const int many : {2, 3, 8})
+        expectComplete(300'007, true, {many, kCheckpointInterval, 7, 50});
     std::mt19937_64 random(20240601);
     std::uniform_int_distribution<std::int64_t> pick(100, 3'000'000);
-    for (int i = 0; i < 3; ++i) expectComplete(pick(random), i % 2 == 1, i % 3 + 1);
+    for (int i = 0; i < 3; ++i) expectComplete(pick(random), i % 2 == 1, {i % 3 + 1});
 }
 
 // High up the large primes cross off from their buckets: continued jobs near 10^12 (over 10^7
@@ -97,11 +94,8 @@ TEST(GenerationJob, ContinuedRunsHighUpMatchAPlainSegmentedSieve) {
         const std::int64_t limit = std::min(first + span, top);
         TempFolder folder;
         writeFile(folder.path() + "primes.txt", "");
-        JobSpec spec{"", limit, threads != 2, true, first, 1000};
-        spec.threads = threads;
-        JobHooks hooks;
-        hooks.turnsPerChunk = chunkTurns;
-        const JobRun r = runIn(folder, spec, hooks);
+        const JobSpec spec{"", limit, threads != 2, true, first, 1000};
+        const JobRun r = runIn(folder, spec, {threads, kCheckpointInterval, 0, chunkTurns});
         ASSERT_EQ(r.result.status, Status::Completed) << r.result.error;
         std::string expected;
         std::int64_t serial = spec.primeCountBefore;
@@ -112,147 +106,132 @@ TEST(GenerationJob, ContinuedRunsHighUpMatchAPlainSegmentedSieve) {
     }
 }
 
-// A job stopped after `turns` turns (0: a stop asked before the start, which still lets the first
-// turn run), continued in append mode and stopped again 7 turns later, then continued to its end:
-// each stop leaves whole turns, the end the file of one uninterrupted run. A stop seen after the
-// last turn is a completion.
+// The real files, watched: a stop is asked once the run has written `stopAt` bytes, and each
+// checkpoint during the job must describe records that are in the file (the writer may wait for
+// a few of them, whatever the machine's speed).
+class WatchedFiles final : public JobFiles {
+public:
+    WatchedFiles(StopSignal& stop, std::uint64_t stopAt, bool enumerated, int holdBack = 0)
+        : stop_(stop), stopAt_(stopAt), enumerated_(enumerated), holdBack_(holdBack) {}
+    std::unique_ptr<ResultsSink> openResults(const std::string& path, bool append,
+                                             int& error) override {
+        path_ = path;
+        auto file = JobFiles::openResults(path, append, error);
+        return file ? std::make_unique<Sink>(std::move(file), *this) : nullptr;
+    }
+    std::string saveCheckpoint(const std::string& path, const Checkpoint& c) override {
+        std::string reason = JobFiles::saveCheckpoint(path, c);
+        if (c.interrupted == 1) {
+            ++checkpoints;
+            EXPECT_EQ(c.candidate % 30, 7);
+            EXPECT_EQ(readFile(path), oracleCheckpoint(c.candidate, c.limit, 1));
+            EXPECT_TRUE(readFile(path_).starts_with(oracleResults(c.candidate, enumerated_)))
+                << "file at " << c.candidate;
+        }
+        return reason;
+    }
+    std::atomic<int> checkpoints{0};
+
+private:
+    struct Sink final : SinkRelay {
+        Sink(std::unique_ptr<ResultsSink> file, WatchedFiles& files)
+            : SinkRelay(std::move(file)), f(files) {}
+        int write(const char* data, std::size_t size, std::size_t& written) override {
+            const auto until = std::chrono::steady_clock::now() + 5s;
+            while (f.checkpoints < std::min(++writes / 8, f.holdBack_) &&
+                   std::chrono::steady_clock::now() < until)
+                std::this_thread::sleep_for(100us);
+            const int error = file_->write(data, size, written);
+            if ((bytes += written) >= f.stopAt_) f.stop_.request();
+            return error;
+        }
+        WatchedFiles& f;
+        int writes = 0;
+        std::uint64_t bytes = 0;  // written in this run
+    };
+
+    StopSignal& stop_;
+    const std::uint64_t stopAt_;
+    const bool enumerated_;
+    const int holdBack_;  // checkpoints the writer waits for, one every 8 writes
+    std::string path_;
+};
+
+// A job stopped (0: a stop asked before the start, which still lets the first turn run; else
+// once a chosen count of bytes is written), continued in append mode and stopped again further
+// on, then continued to its end: each stop lands on a whole turn, possibly before chunks that
+// other threads have finished, the checkpoint and count say so, and the end is the file of one
+// uninterrupted run. A stop seen after the last turn is a completion.
 TEST(GenerationJob, StoppedAndContinuedJobsGiveTheFileOfOneRun) {
-    const std::pair<std::int64_t, std::int64_t> cases[] = {
-        {100'000, 0},   {100'000, 1},    {100'000, 2}, {100'000, 3}, {123'457, 40},
-        {100'000, 333}, {123'457, 1000}, {100, 1},     {100, 3}};
-    for (const auto& [limit, turns] : cases) {
+    const std::tuple<std::int64_t, std::uint64_t, int> cases[] = {
+        {100'000, 0, 1},    {100'000, 1, 1},     {100'000, 30, 1}, {123'457, 3000, 2},
+        {200'000, 9000, 3}, {200'000, 20000, 8}, {100, 1, 1},      {100, 30, 3}};
+    int stops = 0;
+    for (const auto& [limit, stopAt, threads] : cases) {
         for (const bool enumerated : {false, true}) {
-            SCOPED_TRACE(std::to_string(turns) + " turns, limit " + std::to_string(limit));
+            SCOPED_TRACE(std::to_string(stopAt) + " bytes, limit " + std::to_string(limit) + ", " +
+                         std::to_string(threads) + " threads");
             TempFolder folder;
             JobSpec spec{"", limit, enumerated};
-            std::int64_t last = 30 * std::max<std::int64_t>(turns, 1) + 7;
-            for (const std::int64_t stopAt : {turns, std::int64_t{7}, std::int64_t{-1}}) {
-                // The stop is raised from inside the job once `stopAt` turns are done, with one
-                // turn per batch; the last run has the default batches and no stop.
+            for (const std::uint64_t bytes : {stopAt, stopAt + 5000, std::uint64_t{0}}) {
+                const bool last = spec.append && bytes == 0;
                 StopSignal stop;
-                if (stopAt == 0) stop.request();
-                JobHooks hooks;
-                hooks.turnsPerBatch = stopAt < 0 ? 0 : 1;
-                hooks.afterBatch = [&stop, stopAt](std::int64_t done) {
-                    if (stopAt >= 0 && done >= stopAt) stop.request();
-                };
-                spec.threads = 1;  // the stop lands exactly after the batch that asks for it
-                const JobRun r = runIn(folder, spec, hooks, stop);
-                if (stopAt < 0 || last + 4 > limit) {
+                if (bytes == 0 && !last) stop.request();
+                WatchedFiles files(stop, last ? UINT64_MAX : std::max<std::uint64_t>(bytes, 1),
+                                   enumerated);
+                const JobRun r =
+                    runIn(folder, spec, {threads, kCheckpointInterval, 5, 40, &files}, stop);
+                if (last || r.result.status == Status::Completed) {
                     expectComplete(r, limit, enumerated);
                     break;
                 }
                 ASSERT_EQ(r.result.status, Status::Stopped);
-                EXPECT_EQ(r.result.candidate, last);
-                EXPECT_EQ(r.checkpoint, oracleCheckpoint(last, limit, 1));
-                EXPECT_TRUE(sameText(r.results, oracleResults(last, enumerated)));
-                EXPECT_EQ(r.result.primeCount, primeCount(last));
-                spec = {"", limit, enumerated, true, last + 4, r.result.primeCount};
-                last += 30 * 7;
+                ++stops;
+                const std::int64_t at = r.result.candidate;
+                EXPECT_TRUE(spec.append || bytes != 0 || at == 37) << at;
+                EXPECT_EQ(at % 30, 7);
+                EXPECT_GT(at, spec.firstTurn);
+                EXPECT_EQ(r.checkpoint, oracleCheckpoint(at, limit, 1));
+                EXPECT_TRUE(sameText(r.results, oracleResults(at, enumerated)));
+                EXPECT_EQ(r.result.primeCount, primeCount(at));
+                spec = {"", limit, enumerated, true, at + 4, r.result.primeCount};
             }
         }
     }
-}
-
-// With several threads a stop raised by one of them lands where the earliest chunk in progress
-// ends, possibly before chunks that other threads have finished: the file still ends on the last
-// whole turn written, the checkpoint and count say so, and a continued job completes the file.
-TEST(GenerationJob, StopsAmongSeveralThreadsLandOnAWholeTurn) {
-    const std::int64_t limit = 200'000;
-    for (const int threads : {2, 3, 8}) {
-        for (const std::int64_t stopAt : {1, 40, 333, 1000, 5000}) {
-            SCOPED_TRACE(std::to_string(threads) + " threads, stop at " + std::to_string(stopAt));
-            const bool enumerated = (threads + stopAt) % 2 == 1;
-            TempFolder folder;
-            StopSignal stop;
-            JobHooks hooks;
-            hooks.turnsPerBatch = 5;
-            hooks.turnsPerChunk = 40;
-            hooks.afterBatch = [&stop, stopAt](std::int64_t turns) {
-                if (turns >= stopAt) stop.request();
-            };
-            JobSpec spec{"", limit, enumerated};
-            spec.threads = threads;
-            const JobRun r = runIn(folder, spec, hooks, stop);
-            ASSERT_EQ(r.result.status, Status::Stopped);
-            const std::int64_t last = r.result.candidate;
-            EXPECT_EQ(last % 30, 7);
-            EXPECT_GE(last, 37);
-            EXPECT_TRUE(sameText(r.results, oracleResults(last, enumerated)));
-            EXPECT_EQ(r.checkpoint, oracleCheckpoint(last, limit, 1));
-            EXPECT_EQ(r.result.primeCount, primeCount(last));
-            JobSpec rest{"", limit, enumerated, true, last + 4, r.result.primeCount};
-            rest.threads = threads;
-            expectComplete(runIn(folder, rest), limit, enumerated);
-        }
-    }
+    EXPECT_GE(stops, 20);  // most stops land inside a job
 }
 
 TEST(GenerationJob, CheckpointsDuringTheJobAgreeWithTheFile) {
     TempFolder folder;
-    JobHooks hooks;
-    hooks.checkpointInterval = std::chrono::milliseconds(0);
-    hooks.turnsPerBatch = 64;
-    hooks.turnsPerChunk = 64;
-    // Hold the sieving back until the checkpointer has caught up a few times, whatever the
-    // machine's speed: one more checkpoint every 6400 turns, up to three.
-    std::atomic<int> seen = 0;
-    hooks.afterBatch = [&seen](std::int64_t turns) {
-        const auto until = std::chrono::steady_clock::now() + 5s;
-        while (seen < std::min<std::int64_t>(turns / 6400, 3) &&
-               std::chrono::steady_clock::now() < until)
-            std::this_thread::sleep_for(100us);
-    };
-    hooks.afterCheckpoint = [&](const Checkpoint& c, std::uint64_t bytes) {
-        ++seen;
-        EXPECT_EQ(c.candidate % 30, 7);
-        EXPECT_EQ(readFile(folder.path() + "primes.ini"),
-                  oracleCheckpoint(c.candidate, 2'000'000, 1));
-        EXPECT_TRUE(readFile(folder.path() + "primes.txt").substr(0, bytes) ==
-                    oracleResults(c.candidate, true))
-            << "file at " << c.candidate;
-    };
+    StopSignal never;
+    WatchedFiles files(never, UINT64_MAX, true, 3);
     // Small batches and small buffers also hand many partial buffers to the writer.
-    JobSpec spec{"", 2'000'000, true};
-    spec.threads = 3;
-    expectComplete(runIn(folder, spec, hooks), 2'000'000, true);
-    EXPECT_GE(seen, 3);
+    expectComplete(runIn(folder, {"", 2'000'000, true}, {3, 0ms, 64, 64, &files}), 2'000'000, true);
+    EXPECT_GE(files.checkpoints, 3);
 }
 
-JobResult failIn(const std::string& folder, std::int64_t limit, const JobHooks& hooks = {},
-                 bool enumerated = false) {
-    const JobResult r = runJob(JobSpec{folder, limit, enumerated}, StopSignal{}, nullptr, hooks);
+JobResult failIn(const std::string& folder, std::int64_t limit) {
+    const JobResult r = runJob(JobSpec{folder, limit}, StopSignal{});
     EXPECT_EQ(r.status, JobResult::Status::Failed);
     return r;
 }
 
-// Failures of the real file system; injected faults have a table of their own.
-TEST(GenerationJobFailure, FailuresNameTheFileAndLeaveAContinuableCheckpoint) {
+// Failures of the real file system: a full device, and a folder that is not there (the
+// checkpoint goes first, before the results file is emptied).
+TEST(GenerationJobFailure, FailuresNameTheFile) {
     if (std::filesystem::exists("/dev/full")) {
         TempFolder folder;
         std::filesystem::create_symlink("/dev/full", folder.path() + "primes.txt");
-        EXPECT_THAT(failIn(folder.path(), 100'000).error,
-                    StartsWith("The file " + folder.path() +
-                               "primes.txt could not be written: No space left on device."));
+        EXPECT_THAT(
+            failIn(folder.path(), 100'000).error,
+            StartsWith(fileWriteFailure(folder.path() + "primes.txt", systemReason(ENOSPC))));
         EXPECT_EQ(readCheckpoint(folder.path() + "primes.ini").checkpoint->interrupted, 0);
     }
-    {
-        TempFolder folder;
-        const std::string missing = folder.path() + "gone/";
-        // The checkpoint goes first, before the results file is emptied.
-        EXPECT_EQ(
-            failIn(missing, 1000).error,
-            "The file " + missing + "primes.ini could not be written: No such file or directory.");
-        EXPECT_FALSE(std::filesystem::exists(missing));
-    }
-    // A folder in the way of the checkpoint's temporary file fails the real rewrite (injected
-    // checkpoint faults have a table of their own).
     TempFolder folder;
-    std::filesystem::create_directory(folder.path() + "primes.ini.tmp");
-    JobHooks atTheEnd;
-    atTheEnd.durable = false;
-    EXPECT_THAT(failIn(folder.path(), 100'000, atTheEnd).error,
-                StartsWith("The file " + folder.path() + "primes.ini could not be written: "));
+    const std::string missing = folder.path() + "gone/";
+    EXPECT_EQ(failIn(missing, 1000).error,
+              fileWriteFailure(missing + "primes.ini", systemReason(ENOENT)));
+    EXPECT_FALSE(std::filesystem::exists(missing));
 }
 
 }  // namespace

@@ -6,8 +6,7 @@
 
 #include "core/folder_lock.hpp"
 #include "generation/checkpoint_file.hpp"
-#include "generation/job_texts.hpp"
-#include "generation/resume_texts.hpp"
+#include "generation/texts.hpp"
 #include "ui/termination_signals.hpp"
 #include "ui/texts.hpp"
 #include "window_fixture.hpp"

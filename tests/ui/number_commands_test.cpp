@@ -1,6 +1,6 @@
 // Test, Factorize and "Cancel all calculations" in the window, through the fake message box.
 #include "core/texts.hpp"
-#include "generation/job_texts.hpp"
+#include "generation/texts.hpp"
 #include "ui/texts.hpp"
 #include "window_fixture.hpp"
 

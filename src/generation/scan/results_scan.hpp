@@ -10,28 +10,16 @@
 #include <string>
 
 #include "core/stop_signal.hpp"
+#include "generation/config.hpp"
+#include "generation/scan/scan_outcome.hpp"
 
 namespace tarn {
-
-struct ResultsScan {
-    enum class Outcome { Sound, Stopped, Unreadable, Damaged };
-    Outcome outcome = Outcome::Unreadable;
-    // Unreadable: the system's reason; Damaged: what is wrong, completing
-    // "the results file <path> ..." (for instance "holds no records").
-    std::string problem;
-    std::int64_t records = 0;    // complete records at or below the candidate
-    std::int64_t lastPrime = 0;  // the last of them
-    bool enumerated = false;
-    std::uint64_t keptBytes = 0;  // where those records end
-    std::uint64_t fileBytes = 0;
-};
 
 // Checks that the records are numbers in one form, increasing, serially numbered from 1 when
 // enumerated, start with the seeds 2, 3, 5, 7, and end with the largest prime at or below
 // resumePoint. Reads blocks of `blockBytes` and looks at `stop` before each (tests make blocks
 // small, to put their boundaries anywhere in short files). In 1 MiB the bytes stay in the cache
 // between the copy from the system and the check; larger blocks measured no faster.
-inline constexpr std::size_t kResultsScanBlockBytes = std::size_t{1} << 20;
 ResultsScan scanResults(const std::string& path, std::int64_t resumePoint, const StopSignal& stop,
                         std::size_t blockBytes = kResultsScanBlockBytes);
 

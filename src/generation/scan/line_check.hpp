@@ -7,7 +7,7 @@
 #include <string>
 #include <string_view>
 
-#include "generation/results_scan.hpp"
+#include "generation/scan/scan_outcome.hpp"
 
 namespace tarn::scan {
 

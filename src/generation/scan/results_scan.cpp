@@ -8,7 +8,7 @@
 // accept in the same way. It is fast because it does little per line and never calls out:
 // - line ends are found 64 bytes at a time, as a bit mask from SIMD compares;
 // - a record is not parsed: its digits, right-aligned in the 16 bytes before the CR, form a key
-//   that orders like the number (results_scan_keys.hpp), so "only digits", "increasing" and "at
+//   that orders like the number (keys.hpp), so "only digits", "increasing" and "at
 //   or below the candidate" are a few vector operations on one register, without a branch that
 //   depends on the data;
 // - the serial number is compared as text with a counter kept in the same form;
@@ -20,7 +20,7 @@
 // The file is read in blocks into one buffer; the start of a line cut by a block boundary is
 // moved in front of the next block, so every line is checked in one piece. A line longer than any
 // record is damaged whatever its middle holds, so only its start and its end are kept.
-#include "generation/results_scan.hpp"
+#include "generation/scan/results_scan.hpp"
 
 #include <bit>
 #include <cerrno>
@@ -31,9 +31,9 @@
 
 #include "core/miller_rabin.hpp"
 #include "core/texts.hpp"
-#include "generation/results_fast_run.hpp"
-#include "generation/results_line_check.hpp"
-#include "generation/results_scan_keys.hpp"
+#include "generation/scan/fast_run.hpp"
+#include "generation/scan/keys.hpp"
+#include "generation/scan/line_check.hpp"
 #include "platform/files.hpp"
 
 namespace tarn {

@@ -1,13 +1,34 @@
-// The texts that the resume and the start-up check show. The first two are the program's own
-// fixed messages; the refusals name the file and what is wrong with it, so that the user can
-// tell a damaged results file from a checkpoint that belongs to another job.
+// Every text the generation layer shows, word for word: the job's lower bound, its reports and
+// failures, the resume's notes and refusals. Kept in one place so that the window, the command
+// line and the tests show the same words.
 #pragma once
 
 #include <cstdint>
 #include <string>
 #include <string_view>
 
+#include "generation/results_sink.hpp"
+
 namespace tarn {
+
+inline constexpr std::int64_t kGenerationMinimum = 100;
+inline constexpr std::string_view kMinimumMessage = "Minimum value is 100";
+// Told when the user stops a job (or the Test command, which shares the window's stop).
+inline constexpr std::string_view kAllStoppedMessage = "All calculations were stopped!";
+
+struct JobResult;
+// "Done!!! The results were saved in the file <path>. 25 primes found up to number 100...
+// Save the file to other location."
+std::string completionReport(const JobResult& result);
+// "INFO: 25 primes found up to number 100..."
+std::string completionInfoLine(const JobResult& result);
+// A job that cannot begin: its first turn is misplaced, or its sieve does not fit in memory.
+std::string misplacedStartFailure(std::int64_t firstTurnStart);
+std::string memoryFailure(std::int64_t limit);
+// "The file <path> was deleted while the job was writing it. ..." and the like; `written` is
+// what the job had written when it looked.
+std::string resultsChangeMessage(const std::string& path, const FileCheck& check,
+                                 std::uint64_t written);
 
 // Shown when the checkpoint's candidate lies above its limit (a job stopped in its last turn).
 inline constexpr std::string_view kImpossibleToResumeMessage =
@@ -22,9 +43,6 @@ inline constexpr std::string_view kInterruptedPrompt =
 // The information line while the resume reads the results file, then while it generates.
 inline constexpr std::string_view kGatheringInfoLine = "INFO: Gathering information...";
 inline constexpr std::string_view kDoingResumeInfoLine = "INFO: Doing resume...";
-
-// Command-line notes.
-inline constexpr std::string_view kNothingToResumeNote = "Nothing to resume.";
 
 // Refusals of files that cannot be continued. Every one ends by saying that nothing changed.
 // A checkpoint without its three numbers, then one that could not be read at all.

@@ -6,8 +6,8 @@
 #include <bit>
 #include <cstdint>
 
-#include "generation/results_scan.hpp"
-#include "generation/results_scan_keys.hpp"
+#include "generation/scan/scan_outcome.hpp"
+#include "generation/scan/keys.hpp"
 
 namespace tarn::scan {
 
