@@ -12,6 +12,7 @@
 #include <utility>
 
 #include "core/wheel.hpp"
+#include "generation/config.hpp"
 #include "generation/sieving_primes.hpp"
 #include "generation/wheel_sieve.hpp"
 
@@ -28,14 +29,13 @@ std::vector<std::vector<std::uint32_t>> largePrimes(std::uint64_t root, std::siz
     std::vector<std::vector<std::uint32_t>> dealt(groups);
     const auto count = static_cast<std::size_t>(1.3 * root / std::log(root));
     for (auto& primes : dealt) primes.reserve(count / groups + 1);
-    constexpr std::int64_t kSegment = 1 << 15;
     const auto first = static_cast<std::int64_t>((kMediumPrimeBound - kSieveFirst) / kSievePeriod);
     const auto end = static_cast<std::int64_t>((root - kSieveFirst) / kSievePeriod) + 1;
     WheelSieve sieve(first, static_cast<std::int64_t>(root));
-    std::vector<std::uint8_t> segment(kSegment);
+    std::vector<std::uint8_t> segment(kSegmentTurns);
     std::size_t found = 0;
-    for (std::int64_t turn = first; turn < end; turn += kSegment) {
-        const auto turns = static_cast<std::size_t>(std::min(kSegment, end - turn));
+    for (std::int64_t turn = first; turn < end; turn += kSegmentTurns) {
+        const auto turns = static_cast<std::size_t>(std::min(kSegmentTurns, end - turn));
         std::fill_n(segment.begin(), turns, 0);
         sieve.sieveNext(segment.data(), turns);
         for (std::size_t i = 0; i < turns; ++i) {
@@ -58,7 +58,7 @@ BucketSieve::BucketSieve(std::int64_t firstTurn, std::int64_t endTurn, std::int6
                          std::int64_t chunkTurns, int groups)
     : firstTurn_(firstTurn),
       chunkTurns_(static_cast<std::uint64_t>(chunkTurns)),
-      chunksPerSpan_(std::max<std::uint64_t>(kSpanTurns / chunkTurns_, 1)),
+      chunksPerSpan_(std::max<std::uint64_t>(kBucketSpanTurns / chunkTurns_, 1)),
       spanTurns_(chunksPerSpan_ * chunkTurns_),
       reciprocal_((std::uint64_t{1} << 32) / spanTurns_),
       shift_(std::has_single_bit(spanTurns_) ? std::countr_zero(spanTurns_) : -1) {
@@ -136,11 +136,11 @@ std::uint64_t BucketSieve::bytesFor(std::int64_t limit) {
 BucketSieve::Block* BucketSieve::freeBlock(Group& group) {
     if (!group.free) {
         // Blocks come in slabs, aligned by hand: no aligned allocation on every system.
-        constexpr std::size_t kSlab = 32;
-        group.storage.push_back(std::make_unique<std::byte[]>((kSlab + 1) * blockBytes_));
+        group.storage.push_back(
+            std::make_unique<std::byte[]>((kBucketSlabBlocks + 1) * blockBytes_));
         auto at = reinterpret_cast<std::uintptr_t>(group.storage.back().get());
         at = (at + blockBytes_ - 1) & ~(blockBytes_ - 1);
-        for (std::size_t i = 0; i < kSlab; ++i) {
+        for (std::size_t i = 0; i < kBucketSlabBlocks; ++i) {
             auto* block = reinterpret_cast<Block*>(at + i * blockBytes_);
             block->next = group.free;
             group.free = block;

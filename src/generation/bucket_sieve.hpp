@@ -5,7 +5,7 @@
 // The primes are dealt into groups; each group crosses off the chunks one after the other, in
 // the order the threads claim them, so different groups can work on different chunks at once.
 // A prime is put in a bucket only once its first multiple comes within reach of the buckets.
-// The buckets are kept by spans of several chunks, about kSpanTurns, crossed off into a span
+// The buckets are kept by spans of several chunks, about kBucketSpanTurns, crossed off into a span
 // of sieve of each group's own and copied out chunk by chunk: a prime below the span's length
 // is then visited once a span rather than once a chunk. The groups' spans are staggered by a
 // chunk each, so that different groups cross off their spans on different chunks and the threads
@@ -82,8 +82,6 @@ private:
     Block* freeBlock(Group& group);
     // The bucket whose block ends at `head` (or has none) gets a fresh one.
     void spill(Group& group, Entry*& head);
-
-    static constexpr std::uint64_t kSpanTurns = 1 << 18;
 
     const std::int64_t firstTurn_;
     const std::uint64_t chunkTurns_;

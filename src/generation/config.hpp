@@ -1,5 +1,5 @@
-// Tuning of the generation engine: sizes and timers that trade memory and flushes for speed. The
-// sieve's own sizes stay with the sieve.
+// Tuning of the generation engine: sizes and timers that trade memory, cache and flushes for
+// speed.
 #pragma once
 
 #include <chrono>
@@ -17,6 +17,15 @@ inline constexpr std::int64_t kSegmentsPerChunk = 4;  // 2 to 5 MiB of records p
 inline constexpr std::uint64_t kSieveBudget = 56u << 20;
 inline constexpr double kChunkRecordBytes = 40;  // per turn at most, from the first turns on
 inline constexpr std::uint64_t kSieveThreadBytes = 2u << 20;  // a wheel sieve, blocks, stack, heap
+// Primes from here on hit a segment at most once per progression: they wait in buckets.
+inline constexpr std::uint32_t kMediumPrimeBound = 1u << 15;
+// From here a prime hits a segment at most 32 times per progression: one walk along the wheel
+// costs less than eight loops.
+inline constexpr std::uint32_t kWalkerBound = 1u << 13;
+// The buckets are kept by spans of about this many turns (a few chunks): a prime shorter than
+// the span is visited once a span rather than once a chunk.
+inline constexpr std::uint64_t kBucketSpanTurns = 1 << 18;
+inline constexpr std::size_t kBucketSlabBlocks = 32;  // blocks allocated at once
 // The results file is read in blocks of this size when a resume checks it.
 inline constexpr std::size_t kResultsScanBlockBytes = std::size_t{1} << 20;
 

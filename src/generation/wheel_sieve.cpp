@@ -78,10 +78,6 @@ void orPattern(std::uint8_t* bytes, std::size_t turns, const std::vector<std::ui
     }
 }
 
-// From here a prime hits a segment of 32 Ki turns at most 32 times per progression: one walk
-// along the wheel costs less than eight loops.
-constexpr std::uint32_t kWalkerBound = 1u << 13;
-
 }  // namespace
 
 WheelSieve::WheelSieve(std::int64_t firstTurn, std::int64_t limit) : turn_(firstTurn) {

@@ -14,10 +14,9 @@
 #include <cstdint>
 #include <vector>
 
-namespace tarn {
+#include "generation/config.hpp"
 
-// Primes from here on hit a segment of 32 Ki turns at most once per progression.
-inline constexpr std::uint32_t kMediumPrimeBound = 1u << 15;
+namespace tarn {
 
 class WheelSieve {
 public:

@@ -1,5 +1,5 @@
-// What the main window hands to the shell: the read-me, the web link and the results file (for
-// a large one after a question; results_size_test.cpp has the figure's boundary).
+// What the main window hands to the shell: the results file (a large one after a question;
+// results_size_test.cpp has the figure's boundary), the read-me and the web link.
 #include <filesystem>
 
 #include "tools/texts.hpp"
@@ -9,7 +9,7 @@
 using namespace tarn;
 using namespace tarn::test;
 
-TEST_F(WindowTest, ShowResultsOpensTheFileOrAsksAboutALargeOne) {
+TEST_F(WindowTest, ResultsReadmeAndWebLinkGoToTheShell) {
     const std::string path = dir.path() + "primes.txt";
     window->show_Click();  // no file: nothing at all
     EXPECT_TRUE(messages.shown.empty() && shell.edited.empty());
@@ -32,25 +32,18 @@ TEST_F(WindowTest, ShowResultsOpensTheFileOrAsksAboutALargeOne) {
     shell.failure = "The program could not be started.";
     window->show_Click();
     EXPECT_EQ(messages.last().text, shell.failure);
-}
 
-TEST_F(WindowTest, ReadmeAndTheWebLinkGoToTheShell) {
-    shell.failure = "no editor";
-    window->readme_Click();  // no README.txt: nothing at all
+    // The read-me (none: nothing at all) and the web link.
+    messages.shown.clear(), shell.edited.clear();
+    window->readme_Click();
     EXPECT_TRUE(shell.edited.empty() && messages.shown.empty());
     writeFile(dir.path() + "README.txt", "Tarn\r\n");
     window->readme_Click();
     EXPECT_EQ(shell.edited, std::vector<std::string>{dir.path() + "README.txt"});
     ASSERT_EQ(messages.shown.size(), 1u);
-    EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, "no editor"));
+    EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, shell.failure));
 
-    // An installed copy opens the read-me it was given instead.
-    TempFolder doc;
     shell.failure.clear();
-    window->setReadmePath(doc.path() + "README.txt");
-    writeFile(doc.path() + "README.txt", "installed\n");
-    window->readme_Click();
-    EXPECT_EQ(shell.edited.back(), doc.path() + "README.txt");
 
     c().Command4->click();
     EXPECT_EQ(shell.urls, std::vector<std::string>{std::string(ui::kMakerWebAddress)});

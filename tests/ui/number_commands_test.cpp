@@ -18,7 +18,7 @@ protected:
     static constexpr const char* kLargePrime = "922337203685123";
 };
 
-TEST_F(NumberCommandTest, TestAndFactorizeShowTheirResults) {
+TEST_F(NumberCommandTest, TestAndFactorizeShowTheirResultsRefuseASecondCommandAndStop) {
     run(c().Command2, "abc");
     EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, kInvalidEntryMessage));
     EXPECT_EQ(status(), ui::kStatusIdle);
@@ -53,19 +53,16 @@ TEST_F(NumberCommandTest, TestAndFactorizeShowTheirResults) {
     EXPECT_TRUE(c().Text4->toPlainText().isEmpty());
     EXPECT_EQ(status(), ui::kStatusCalculationsStopped);
     EXPECT_EQ(messages.shown.size(), 5u);
-}
-
-TEST_F(NumberCommandTest, ASecondCommandIsRefusedAndCancelStopsALongTest) {
-    c().Text2->setText(kLargePrime);
+    // While a long test runs a second command is refused; Cancel stops the test.
     c().Command2->click();
     EXPECT_EQ(status(), ui::kStatusWorking);
     c().Command6->click();
-    ASSERT_EQ(messages.shown.size(), 1u);
+    ASSERT_EQ(messages.shown.size(), 6u);
     EXPECT_EQ(messages.lastSaid(), messages.said(ui::kInfoTitle, ui::kNumberCommandBusy));
     c().Command5->click();
     EXPECT_EQ(status(), ui::kStatusCalculationsStopped);
     ASSERT_TRUE(idle());
-    ASSERT_EQ(messages.shown.size(), 2u);
+    ASSERT_EQ(messages.shown.size(), 7u);
     EXPECT_EQ(messages.lastSaid(), messages.said(ui::kCommandTitle, kAllStoppedMessage));
     EXPECT_EQ(status(), ui::kStatusTestStopped);
 }
