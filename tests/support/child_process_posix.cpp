@@ -35,10 +35,14 @@ ChildProcess::~ChildProcess() {
 
 bool ChildProcess::stop(Stop how) {
     const int signals[] = {SIGINT, SIGTERM, SIGHUP};
-    return ::kill(static_cast<pid_t>(process_), signals[static_cast<int>(how)]) == 0;
+    return process_ > 0 && code_ < 0 &&
+           ::kill(static_cast<pid_t>(process_), signals[static_cast<int>(how)]) == 0;
 }
 
-void ChildProcess::kill() { ::kill(static_cast<pid_t>(process_), SIGKILL); }
+void ChildProcess::kill() {
+    // Never the whole group (0), nor a number the system gave again after the child was reaped.
+    if (process_ > 0 && code_ < 0) ::kill(static_cast<pid_t>(process_), SIGKILL);
+}
 
 bool ChildProcess::finished() {
     int status = 0;
