@@ -43,7 +43,9 @@ TEST(JobCommands, ReportsGoToStdoutRefusalsToStderrWithTheirExitCodes) {
                                                        results + ". " + c.report +
                                                        "... Save the file to other location.\n";
         EXPECT_EQ(runCli(args, output.path()), (CliRun{c.code, out, c.err}));
-        if (c.number == "100.9") EXPECT_EQ(readFile(results), oracleResults(100, true));
+        if (c.number == "100.9") {
+            EXPECT_EQ(readFile(results), oracleResults(100, true));
+        }
     }
 }
 
