@@ -6,13 +6,11 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <chrono>
 #include <random>
-#include <thread>
 
-#include "cli/cli_child.hpp"
 #include "generation/checkpoint_file.hpp"
 #include "generation/results_oracle.hpp"
+#include "support/child_process.hpp"
 
 namespace tarn {
 namespace {
@@ -51,11 +49,10 @@ TEST(ResumeCrash, KilledJobsResumeToTheUninterruptedFile) {
             resumes += resume;
             // One sieving thread, two, and more than the cores, in turn.
             const std::string threads = "--threads=" + std::to_string((run + attempt) % 3 * 2 + 1);
-            CliChild child(
-                resume ? std::vector<std::string>{"--folder", folder.path(), "resume", threads}
-                       : std::vector<std::string>{"--folder", folder.path(), "generate", limit,
-                                                  threads},
-                output.path());
+            std::vector<std::string> args{"--folder", folder.path(), resume ? "resume" : "generate",
+                                          threads};
+            if (!resume) args.push_back(limit);
+            ChildProcess child(args, output.path());
             // Then let it run to its end; while no kill has yet left a job to resume (a start-up
             // slower than the one measured, as under an emulator), kill on a little longer.
             const bool kill = attempt < 4 || (resumes == 0 && attempt < 12);

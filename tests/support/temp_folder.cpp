@@ -3,36 +3,28 @@
 #include <fstream>
 #include <iterator>
 #include <random>
-#include <stdexcept>
 
 #include "core/path_text.hpp"
 #include "platform/path_separator.hpp"
 
 namespace tarn::test {
 
+namespace fs = std::filesystem;
+
 TempFolder::TempFolder() {
-    namespace fs = std::filesystem;
-    std::random_device seed;
-    std::mt19937_64 random(seed());
-    // A new name that no other test or process has taken: create_directory fails on one that is.
-    for (int attempt = 0; attempt < 100 && path_.empty(); ++attempt) {
-        const fs::path folder =
-            fs::temp_directory_path() / ("tarn-test-" + std::to_string(random()));
-        std::error_code ec;
-        if (fs::create_directory(folder, ec)) {
-            fs::permissions(folder, fs::perms::owner_all, fs::perm_options::replace, ec);
-            path_ = utf8(folder) + platform::kPathSeparator;
-        }
-    }
-    if (path_.empty()) throw std::runtime_error("no temporary folder");
+    std::mt19937_64 random(std::random_device{}());
+    fs::path folder;
+    // A name no other test or process has taken: create_directory fails on one that is.
+    do folder = fs::temp_directory_path() / ("tarn-test-" + std::to_string(random()));
+    while (!fs::create_directory(folder));
+    fs::permissions(folder, fs::perms::owner_all, fs::perm_options::replace);
+    path_ = utf8(folder) + platform::kPathSeparator;
 }
 
 TempFolder::~TempFolder() {
-    std::error_code ec;
-    const auto folder = pathFromUtf8(path_);
-    std::filesystem::permissions(folder, std::filesystem::perms::owner_all,
-                                 std::filesystem::perm_options::add, ec);
-    std::filesystem::remove_all(folder, ec);
+    std::error_code ec;  // a test may have taken the owner's rights away
+    fs::permissions(pathFromUtf8(path_), fs::perms::owner_all, fs::perm_options::add, ec);
+    fs::remove_all(pathFromUtf8(path_), ec);
 }
 
 std::string readFile(const std::string& path) {
